@@ -1,0 +1,41 @@
+# kt_compile_options: what every target of this project is compiled with.
+
+add_library(kt_compile_options INTERFACE)
+
+if(MSVC)
+  # The working draft's option brings std::string::resize_and_overwrite; headers need C++20 only.
+  target_compile_options(kt_compile_options INTERFACE /std:c++latest /W4 /WX /utf-8 /permissive- /EHa)
+  target_compile_definitions(kt_compile_options INTERFACE _CRT_SECURE_NO_WARNINGS)
+else()
+  target_compile_options(
+    kt_compile_options
+    INTERFACE -std=c++23
+              -Wall
+              -Wextra
+              -Wpedantic
+              -Wshadow
+              -Wconversion
+              -Wnon-virtual-dtor
+              -Woverloaded-virtual
+              -Werror
+              # Two exported queries return constant values, as their callers expect.
+              -Wno-ignored-qualifiers
+              -fno-math-errno
+              # No path of the building machine in the products.
+              -ffile-prefix-map=${CMAKE_SOURCE_DIR}=.)
+endif()
+
+target_compile_definitions(
+  kt_compile_options
+  INTERFACE $<$<BOOL:${WIN32}>:WIN32_LEAN_AND_MEAN
+            NOMINMAX
+            UNICODE
+            _UNICODE
+            WINVER=0x0A00
+            _WIN32_WINNT=0x0A00>)
+
+if(KT_SANITIZE)
+  add_compile_options(-fsanitize=${KT_SANITIZE} -fno-sanitize-recover=all -fno-omit-frame-pointer)
+  string(REPLACE "fuzzer-no-link," "" link_sanitizers "${KT_SANITIZE}")
+  add_link_options(-fsanitize=${link_sanitizers})
+endif()

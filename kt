@@ -1,0 +1,260 @@
+#!/usr/bin/env bash
+# kt: sets up, builds, runs and checks KTPublic. `./kt help` lists what it does.
+#
+# Everything it makes lives under build/: compiled programs, the Wine prefix, downloaded sources, stamps of finished
+# set-up steps. Only missing Debian packages are installed outside, and only as root or with sudo.
+set -euo pipefail
+
+root=$(cd "$(dirname "${BASH_SOURCE[0]}")" && pwd)
+stamps=$root/build/setup
+jobs=$(nproc)
+
+build_packages=(g++-mingw-w64-x86-64-posix mingw-w64-x86-64-dev binutils-mingw-w64-x86-64 cmake ninja-build
+    wine wine64 googletest libboost1.81-dev xz-utils bzip2)
+native_packages=(clang-19 libclang-rt-19-dev g++ libboost-thread1.81-dev)
+bench_packages=(libspdlog-dev libfmt-dev libutfcpp-dev)
+lint_packages=(clang-19 clang-format-19 clang-tidy-19)
+
+usage() {
+    cat <<'TEXT'
+usage: ./kt COMMAND
+
+  demo [FOLDER]         run the demo host on examples/course/, or on FOLDER
+  test [CTEST-ARGS]     every test; the arguments go to ctest, for example -L strings
+  build                 build/windows/bin/ and build/windows/lib/
+  run PROGRAM [ARGS]    any Windows program, with the library on its path; its exit status is passed through
+  bench [FILTER]        the benchmarks beside their peers; the page is build/bench/index.html
+  sanitize              the portable half natively under ASan and UBSan, then under TSan
+  fuzz SECONDS          every fuzz target for that long
+  lint                  clang-format and clang-tidy over all sources
+  install PREFIX        DLL, headers, CMake package, tools and licence notes
+
+The first call of a command sets up what it needs; later calls start at once.
+TEXT
+}
+
+fail() {
+    printf 'kt: %s\n' "$1" >&2
+    exit 1
+}
+
+# ---- set-up ----
+
+# as_root COMMAND...: runs it as root, or says what is missing.
+as_root() {
+    if [ "$(id -u)" = 0 ]; then
+        "$@"
+    elif command -v sudo >/dev/null && { [ -t 0 ] || sudo -n true 2>/dev/null; }; then
+        sudo "$@"
+    else
+        return 77
+    fi
+}
+
+apt_install() {
+    as_root env DEBIAN_FRONTEND=noninteractive apt-get install -y --no-install-recommends "$@"
+}
+
+# need_packages PACKAGE...: installs those that are not there.
+need_packages() {
+    local package missing=() log=$stamps/apt.log status
+    for package in "$@"; do
+        [ -e "$stamps/package-$package" ] && continue
+        if dpkg-query -W -f '${Status}' "$package" 2>/dev/null | grep -q 'ok installed'; then
+            : >"$stamps/package-$package"
+        else
+            missing+=("$package")
+        fi
+    done
+    [ ${#missing[@]} = 0 ] && return
+    command -v apt-get >/dev/null || fail "needs Debian's packages ${missing[*]}, and there is no apt-get here"
+    echo "kt: installing ${missing[*]}"
+    status=0
+    apt_install "${missing[@]}" >"$log" 2>&1 || status=$?
+    if [ $status = 77 ]; then
+        fail "please install these packages as root: apt-get install ${missing[*]}"
+    elif [ $status != 0 ]; then
+        # The package lists may be missing or out of date.
+        as_root apt-get update >>"$log" 2>&1 || fail "apt-get update failed: is the network there? (build/setup/apt.log)"
+        apt_install "${missing[@]}" >>"$log" 2>&1 || fail "could not install ${missing[*]} (build/setup/apt.log)"
+    fi
+    for package in "${missing[@]}"; do : >"$stamps/package-$package"; done
+}
+
+# private_apt ARGS...: apt-get on package lists of our own, with source packages switched on. The system's stay as they
+# are.
+private_apt() {
+    apt-get -q -o "Dir::Etc::SourceList=$root/build/apt/sources.list" -o Dir::Etc::SourceParts=- \
+        -o "Dir::State::Lists=$root/build/apt/lists" -o "Dir::Cache=$root/build/apt/cache" \
+        -o APT::Sandbox::User= "$@"
+}
+
+# Writes the system's Debian archives as source archives.
+write_source_list() {
+    mkdir -p "$root/build/apt/lists/partial" "$root/build/apt/cache/archives/partial"
+    apt-get indextargets --format 'deb-src [signed-by=/usr/share/keyrings/debian-archive-keyring.gpg] $(SITE) $(RELEASE) $(COMPONENT)' \
+        'Created-By: Packages' 'Origin: Debian' | sort -u >"$root/build/apt/sources.list"
+    [ -s "$root/build/apt/sources.list" ] && return
+    as_root apt-get update >"$stamps/apt.log" 2>&1 || fail "apt-get update failed: is the network there? (build/setup/apt.log)"
+    apt-get indextargets --format 'deb-src [signed-by=/usr/share/keyrings/debian-archive-keyring.gpg] $(SITE) $(RELEASE) $(COMPONENT)' \
+        'Created-By: Packages' 'Origin: Debian' | sort -u >"$root/build/apt/sources.list"
+    [ -s "$root/build/apt/sources.list" ] || fail "found no Debian archive among this machine's package sources"
+}
+
+# need_source PACKAGE FOLDER...: unpacks these folders of a Debian source package to build/sources/PACKAGE. apt checks
+# what it downloads against the signed index.
+need_source() {
+    local package=$1 log=$stamps/source.log download=$root/build/apt/$1 archive
+    shift
+    [ -e "$stamps/source-$package" ] && return
+    echo "kt: fetching the sources of $package"
+    write_source_list
+    rm -rf "$download" "$root/build/sources/$package"
+    mkdir -p "$download" "$root/build/sources/$package"
+    private_apt update >"$log" 2>&1 || fail "could not read the source package lists (build/setup/source.log)"
+    (cd "$download" && private_apt source --download-only "$package") >>"$log" 2>&1 ||
+        fail "could not fetch the sources of $package: is the network there? (build/setup/source.log)"
+    archive=$(find "$download" -name '*.orig.tar.*' ! -name '*.asc' | head -n 1)
+    [ -n "$archive" ] || fail "the source package of $package holds no archive (build/setup/source.log)"
+    tar -xf "$archive" -C "$root/build/sources/$package" --strip-components=1 --wildcards "${@/#/*/}" ||
+        fail "could not unpack the sources of $package"
+    rm -rf "$download"
+    : >"$stamps/source-$package"
+}
+
+# The project's own Wine prefix: no display, Windows 10, nothing of it outside build/.
+need_wine() {
+    [ -e "$stamps/wine" ] && return
+    echo "kt: preparing the Wine prefix"
+    local log=$stamps/wine.log
+    rm -rf "$root/build/wine" "$root/build/home"
+    mkdir -p "$root/build/home"
+    {
+        "$root/cmake/wine-run" wineboot --init &&
+            "$root/cmake/wine-run" reg add 'HKCU\Software\Wine\Drivers' /v Graphics /d null /f &&
+            "$root/cmake/wine-run" reg add 'HKCU\Software\Wine' /v Version /d win10 /f
+    } >"$log" 2>&1 </dev/null || fail "could not prepare the Wine prefix (build/setup/wine.log)"
+    : >"$stamps/wine"
+}
+
+need_build_tools() {
+    mkdir -p "$stamps"
+    need_packages "${build_packages[@]}"
+    need_source boost1.81 libs/thread/src
+    need_wine
+}
+
+# configure PRESET [CMAKE-ARGS]: once, and again when asked for other options.
+configure() {
+    local preset=$1 stamp=$stamps/configured-$1 wanted
+    shift
+    wanted="$root $*"
+    [ -e "$root/build/$preset/build.ninja" ] && [ "$(cat "$stamp" 2>/dev/null)" = "$wanted" ] && return
+    (cd "$root" && cmake --preset "$preset" "$@") >"$stamps/configure-$preset.log" 2>&1 || {
+        tail -n 20 "$stamps/configure-$preset.log" >&2
+        fail "could not configure $preset (build/setup/configure-$preset.log)"
+    }
+    printf '%s' "$wanted" >"$stamp"
+}
+
+compile() {
+    local folder=$1
+    shift
+    ninja -C "$root/build/$folder" --quiet "$@" || fail "the build of $folder failed"
+}
+
+# ---- commands ----
+
+build() {
+    need_build_tools
+    configure windows
+    compile windows
+}
+
+command_demo() {
+    local folder=${1:-$root/examples/course}
+    [ $# -le 1 ] || fail "usage: ./kt demo [FOLDER]"
+    [ -d "$folder" ] || fail "no such folder: $folder"
+    build
+    "$root/cmake/wine-run" "$root/build/windows/bin/ktdemo.exe" "$(cd "$folder" && pwd)"
+}
+
+command_test() {
+    build
+    ctest --test-dir "$root/build/windows" --output-on-failure --no-tests=error -j "$jobs" "$@"
+}
+
+command_run() {
+    [ $# -ge 1 ] || fail "usage: ./kt run PROGRAM [ARGS]"
+    need_build_tools
+    "$root/cmake/wine-run" "$@"
+}
+
+command_bench() {
+    need_build_tools
+    need_packages "${bench_packages[@]}"
+    need_source benchmark cmake include src CMakeLists.txt
+    configure windows -DKT_BUILD_BENCH=ON
+    compile windows
+    mkdir -p "$root/build/bench"
+    (cd "$root/build/bench" && "$root/cmake/wine-run" "$root/build/windows/bin/ktbench.exe" \
+        --page=index.html ${1:+--benchmark_filter="$1"})
+}
+
+command_sanitize() {
+    mkdir -p "$stamps"
+    need_packages cmake ninja-build googletest "${native_packages[@]}"
+    local preset
+    for preset in native-asan native-tsan; do
+        configure "$preset"
+        compile "$preset"
+        echo "kt: $preset"
+        ctest --test-dir "$root/build/$preset" --output-on-failure --no-tests=error -j "$jobs"
+    done
+}
+
+command_fuzz() {
+    local seconds=${1:-} target
+    [[ $seconds =~ ^[0-9]+$ ]] || fail "usage: ./kt fuzz SECONDS"
+    mkdir -p "$stamps"
+    need_packages cmake ninja-build "${native_packages[@]}"
+    configure native-fuzz
+    compile native-fuzz
+    for target in "$root"/build/native-fuzz/bin/fuzz_*; do
+        local name=${target##*/fuzz_}
+        local corpus=$root/build/fuzz/$name
+        mkdir -p "$corpus"
+        echo "kt: fuzzing $name for $seconds s"
+        (cd "$root/build/fuzz" && "$target" -max_total_time="$seconds" -timeout=10 -rss_limit_mb=2048 -print_final_stats=1 \
+            -verbosity=0 "$corpus" "$root/fuzz/corpus/$name") || fail "fuzz target $name failed"
+    done
+}
+
+command_lint() {
+    need_build_tools
+    need_packages "${lint_packages[@]}"
+    configure windows
+    "$root/cmake/lint" "$root"
+}
+
+command_install() {
+    [ $# = 1 ] || fail "usage: ./kt install PREFIX"
+    build
+    cmake --install "$root/build/windows" --prefix "$1"
+}
+
+main() {
+    local command=${1:-help}
+    [ $# = 0 ] || shift
+    case $command in
+    demo | test | run | bench | sanitize | fuzz | lint | install) "command_$command" "$@" ;;
+    build) build ;;
+    help | -h | --help) usage ;;
+    *)
+        usage >&2
+        exit 2
+        ;;
+    esac
+}
+
+main "$@"

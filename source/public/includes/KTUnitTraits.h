@@ -1,0 +1,75 @@
+// KTUnitTraits.h: character traits for UTF-16 code units held as unsigned short.
+//
+// The standard only promises std::char_traits for its own character types, so the library brings the traits that
+// std::basic_string needs for its units. Units compare as unsigned numbers; there is no locale and no normalisation.
+
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+#include <ios>
+#include <string>
+
+/// Traits of a UTF-16 code unit, with the meaning of the members as in std::char_traits.
+struct KTUnitTraits {
+    using char_type = unsigned short;
+    using int_type = std::uint32_t;
+    using off_type = std::streamoff;
+    using pos_type = std::streampos;
+    using state_type = std::mbstate_t;
+
+    static constexpr void assign(char_type &to, char_type const &from) noexcept { to = from; }
+    static constexpr bool eq(char_type a, char_type b) noexcept { return a == b; }
+    static constexpr bool lt(char_type a, char_type b) noexcept { return a < b; }
+
+    static constexpr int compare(char_type const *a, char_type const *b, std::size_t count) noexcept {
+        for (std::size_t i = 0; i < count; ++i) {
+            if (a[i] != b[i]) {
+                return a[i] < b[i] ? -1 : 1;
+            }
+        }
+        return 0;
+    }
+
+    static constexpr std::size_t length(char_type const *text) noexcept {
+        std::size_t count = 0;
+        while (text[count] != 0) {
+            ++count;
+        }
+        return count;
+    }
+
+    static constexpr char_type const *find(char_type const *text, std::size_t count, char_type const &unit) noexcept {
+        for (std::size_t i = 0; i < count; ++i) {
+            if (text[i] == unit) {
+                return text + i;
+            }
+        }
+        return nullptr;
+    }
+
+    static char_type *move(char_type *to, char_type const *from, std::size_t count) noexcept {
+        return count == 0 ? to : static_cast<char_type *>(std::memmove(to, from, count * sizeof(char_type)));
+    }
+
+    static char_type *copy(char_type *to, char_type const *from, std::size_t count) noexcept {
+        return count == 0 ? to : static_cast<char_type *>(std::memcpy(to, from, count * sizeof(char_type)));
+    }
+
+    static constexpr char_type *assign(char_type *to, std::size_t count, char_type unit) noexcept {
+        for (std::size_t i = 0; i < count; ++i) {
+            to[i] = unit;
+        }
+        return to;
+    }
+
+    static constexpr char_type to_char_type(int_type value) noexcept { return static_cast<char_type>(value); }
+    static constexpr int_type to_int_type(char_type unit) noexcept { return unit; }
+    static constexpr bool eq_int_type(int_type a, int_type b) noexcept { return a == b; }
+    static constexpr int_type eof() noexcept { return 0xFFFFFFFFU; }
+    static constexpr int_type not_eof(int_type value) noexcept { return value == eof() ? 0U : value; }
+};
+
+/// A run of UTF-16 code units, always followed by a terminating zero unit. The storage behind KTString and OString.
+using KTUnits = std::basic_string<unsigned short, KTUnitTraits>;
