@@ -126,14 +126,16 @@ std::size_t CountBytes(Unit const *from, std::size_t count) {
     __m128i const low = _mm_set1_epi16(static_cast<short>(0xDC00));
     while (count - i > 8) { // one unit past the block is read, for the second half of a pair
         std::size_t const left = (count - i - 1) / 8;
-        std::size_t blocks = left < 63 ? left : 63; // each block adds at most 2 to each byte of a counter, bias included
+        std::size_t blocks =
+            left < 63 ? left : 63; // each block adds at most 2 to each byte of a counter, bias included
         __m128i extra = zero;
         __m128i pairs = zero;
         for (; blocks != 0; --blocks, i += 8) {
             __m128i const units = Load(from + i);
             __m128i const next = Load(from + i + 1);
             __m128i const two = _mm_cmpeq_epi16(_mm_and_si128(units, _mm_set1_epi16(static_cast<short>(0xFF80))), zero);
-            __m128i const three = _mm_cmpeq_epi16(_mm_and_si128(units, _mm_set1_epi16(static_cast<short>(0xF800))), zero);
+            __m128i const three =
+                _mm_cmpeq_epi16(_mm_and_si128(units, _mm_set1_epi16(static_cast<short>(0xF800))), zero);
             __m128i const pair = _mm_and_si128(_mm_cmpeq_epi16(_mm_and_si128(units, surrogateBits), high),
                                                _mm_cmpeq_epi16(_mm_and_si128(next, surrogateBits), low));
             extra = _mm_add_epi16(_mm_add_epi16(extra, _mm_set1_epi16(2)), _mm_add_epi16(two, three));
@@ -268,8 +270,8 @@ Character TakeOne(Byte const *from, Byte const *end) {
     }
     if ((lead & 0xF8) == 0xF0 && left >= 4 && IsContinuation(from[1]) && IsContinuation(from[2]) &&
         IsContinuation(from[3])) {
-        unsigned const value = ((lead & 0x07U) << 18) | ((from[1] & 0x3FU) << 12) | ((from[2] & 0x3FU) << 6) |
-                               (from[3] & 0x3FU);
+        unsigned const value =
+            ((lead & 0x07U) << 18) | ((from[1] & 0x3FU) << 12) | ((from[2] & 0x3FU) << 6) | (from[3] & 0x3FU);
         return {value, value >= 0x10000 && value <= 0x10FFFF ? 4U : 0U};
     }
     return {kReplacement, 0};
@@ -332,7 +334,7 @@ std::size_t CountUnitsWithReplacements(Byte const *from, Byte const *end) {
     std::size_t units = 0;
     while (from != end) {
         Character const one = TakeOne(from, end);
-        units += one.codePoint >= 0x10000 ? 2 : 1;
+        units += one.length == 4 ? 2 : 1;
         from += one.length != 0 ? one.length : IllFormedLength(from, end);
     }
     return units;

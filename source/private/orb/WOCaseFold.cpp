@@ -12,8 +12,8 @@ KTUnits OFoldCase(KTUnits const &text) {
     KTUnits folded = text;
     for (std::size_t at = 0; at < folded.size(); at += kPiece) {
         auto const count = static_cast<int>(std::min(kPiece, folded.size() - at));
-        LCMapStringEx(LOCALE_NAME_INVARIANT, LCMAP_LOWERCASE, reinterpret_cast<wchar_t const *>(text.data() + at), count,
-                      reinterpret_cast<wchar_t *>(folded.data() + at), count, nullptr, nullptr, 0);
+        LCMapStringEx(LOCALE_NAME_INVARIANT, LCMAP_LOWERCASE, reinterpret_cast<wchar_t const *>(text.data() + at),
+                      count, reinterpret_cast<wchar_t *>(folded.data() + at), count, nullptr, nullptr, 0);
     }
     return folded;
 }

@@ -9,7 +9,6 @@
 #include <boost/thread/mutex.hpp>
 #include <boost/thread/recursive_mutex.hpp>
 
-
 class KTMutexImpl {
   public:
     boost::mutex &get() { return m_Mutex; }
@@ -58,4 +57,3 @@ class KTConditionImpl {
   private:
     boost::condition_variable_any m_Condition;
 };
-

@@ -93,6 +93,8 @@ KTUnits Joined(KTUnits const &left, Unit const *right, Size count) {
 
 } // namespace
 
+KTString::size_type const KTString::npos;
+
 KTString::size_type KTString::GetNPos() { return npos; }
 
 // ---- construction and conversion ----
@@ -265,9 +267,7 @@ KTString &KTString::insert(size_type pos, unsigned short const *units, size_type
     return replace(pos, 0, units, count);
 }
 
-KTString &KTString::insert(size_type pos, size_type count, unsigned short unit) {
-    return replace(pos, 0, count, unit);
-}
+KTString &KTString::insert(size_type pos, size_type count, unsigned short unit) { return replace(pos, 0, count, unit); }
 
 KTString::iterator KTString::insert(const_iterator at, unsigned short unit) { return m_Units.insert(at, unit); }
 

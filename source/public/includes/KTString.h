@@ -54,7 +54,7 @@ class KT_PUBLIC_API KTString {
     using BaseManipulator = std::ios_base &(*)(std::ios_base &);
 
     /// The not-found position of every search, and "to the end" as a count: the largest unsigned 64-bit value.
-    static constexpr size_type npos = static_cast<size_type>(-1);
+    static const size_type npos = static_cast<size_type>(-1);
 
     /// npos, for callers that cannot read a static constant across the boundary.
     static size_type GetNPos();
