@@ -3,14 +3,12 @@
 add_library(kt_compile_options INTERFACE)
 
 if(MSVC)
-  # The working draft's option brings std::string::resize_and_overwrite; headers need C++20 only.
-  target_compile_options(kt_compile_options INTERFACE /std:c++latest /W4 /WX /utf-8 /permissive- /EHa)
+  target_compile_options(kt_compile_options INTERFACE /W4 /WX /utf-8 /permissive- /EHa)
   target_compile_definitions(kt_compile_options INTERFACE _CRT_SECURE_NO_WARNINGS)
 else()
   target_compile_options(
     kt_compile_options
-    INTERFACE -std=c++23
-              -Wall
+    INTERFACE -Wall
               -Wextra
               -Wpedantic
               -Wshadow

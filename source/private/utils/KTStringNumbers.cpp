@@ -14,6 +14,8 @@ namespace {
 constexpr std::size_t kNumberBuffer = 100;
 constexpr char kReportPath[] = "source/private/utils/KTString";
 
+void ReportTooLong() { KTAssertFailed("Number does not fit the buffer", kReportPath, 312); }
+
 // Formats into the number buffer and appends the text; what does not fit is reported and nothing is appended.
 KTErrorCodeEnum AppendFormatted(KTString &text, char const *format, ...) {
     char buffer[kNumberBuffer];
@@ -22,7 +24,7 @@ KTErrorCodeEnum AppendFormatted(KTString &text, char const *format, ...) {
     int const length = OFormatTruncating(buffer, sizeof buffer, format, values);
     va_end(values);
     if (length < 0) {
-        KTAssertFailed("Number does not fit the buffer", kReportPath, 312);
+        ReportTooLong();
     } else {
         text += buffer;
     }
@@ -78,6 +80,10 @@ KTErrorCodeEnum KTString::AppendPointer(void *pointer) {
 }
 
 KTErrorCodeEnum KTString::AppendRealNumber(KTReal number, int precision) {
+    if (precision >= static_cast<int>(kNumberBuffer)) {
+        ReportTooLong(); // so many digits never fit: the run-time need not make them first
+        return kKTErrorNone;
+    }
     std::string const format = "%." + std::to_string(precision) + "f";
     return AppendFormatted(*this, format.c_str(), number.AsDouble());
 }
