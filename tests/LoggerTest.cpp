@@ -67,10 +67,10 @@ TEST(Logger, NarrowsWideTextToLowBytes) {
 
 TEST(Logger, FormatsBytes) {
     LogLines log;
-    gKTLogger->Log("%d %s %5.1f%%", 7, "text", 2.25);
+    gKTLogger->Log("%d %s %5.1f%%", 7, "text", 2.5);
     std::string const longText(100000, 'q');
     gKTLogger->Log("%s", longText.c_str());
-    EXPECT_EQ(log.Take(), (Lines{"7 text   2.3%", longText}));
+    EXPECT_TRUE(log.Take() == (Lines{"7 text   2.5%", longText}));
 }
 
 TEST(Logger, FormatsWideText) {
@@ -78,7 +78,7 @@ TEST(Logger, FormatsWideText) {
     gKTLogger->Log(L"%d|%c", 7, 'c');
     std::wstring const longText(100000, L'q');
     gKTLogger->Log(L"%ls", longText.c_str());
-    EXPECT_EQ(log.Take(), (Lines{"7|c", std::string(100000, 'q')}));
+    EXPECT_TRUE(log.Take() == (Lines{"7|c", std::string(100000, 'q')}));
 }
 
 TEST(Logger, WithoutPerCentSignTheFormatIsTheMessage) {
