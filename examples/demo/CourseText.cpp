@@ -6,6 +6,7 @@ namespace {
 
 constexpr std::size_t kMost = 10'000;
 constexpr std::size_t kLongestLine = 4'096; // no entry and no caption is longer
+constexpr double kLongestCourse = 360'000;  // seconds; later times are no times
 
 bool StartsWithDigit(KTString const &text) { return !text.empty() && text[0] >= '0' && text[0] <= '9'; }
 
@@ -42,7 +43,7 @@ void CourseTextCollector::AddCue(KTString const &line) {
     // The text may hold separators of its own.
     Cue cue{pieces[0].GetDoubleValue(), pieces[1].GetDoubleValue(),
             line.substr(pieces[0].size() + pieces[1].size() + 2)};
-    if (cue.start <= cue.end) {
+    if (cue.start <= cue.end && cue.end <= kLongestCourse) {
         m_Cues.push_back(std::move(cue));
     }
 }

@@ -84,7 +84,7 @@ std::string ReportTexts(std::vector<TextResult> const &results, ReportLimits con
         sum += facts;
         bytes += result.file.size;
         if (rows++ < limits.rows) {
-            std::string const name = PrintableCut(result.file.name, kNameWidth);
+            std::string const name = PrintableTail(result.file.name, kNameWidth);
             auto const count = [&](KTUInt64 number) { return result.isRead ? Number(number) : "-"; };
             table.AddRow({name, result.isRead ? result.encoding : "-", Number(result.file.size), count(facts.units),
                           count(facts.lines), count(facts.words), count(facts.nonAscii), count(facts.replacements),
@@ -110,7 +110,7 @@ std::string ReportCaptions(std::vector<TextResult> const &results) {
         for (Cue const &cue : cues) {
             seconds += cue.end - cue.start;
         }
-        table.AddRow({PrintableCut(captions[i]->file.name, kNameWidth), Number(cues.size()), Seconds(seconds),
+        table.AddRow({PrintableTail(captions[i]->file.name, kNameWidth), Number(cues.size()), Seconds(seconds),
                       PrintableCut(cues.front().text, kTextWidth)});
     }
     return "Captions\n" + table.Print() + More(captions.size(), kMostFiles, "file") + "\n";
@@ -158,7 +158,7 @@ std::string ReportOtherFiles(CourseFolder const &folder, ReportLimits const &lim
     std::size_t rows = 0;
     for (CourseFile const &file : folder.files) {
         if (file.kind != FileKind::Text && rows++ < limits.rows) {
-            table.AddRow({PrintableCut(file.name, kNameWidth), Number(file.size),
+            table.AddRow({PrintableTail(file.name, kNameWidth), Number(file.size),
                           file.kind == FileKind::Picture ? DescribePicture(file.path) : ""});
         }
     }

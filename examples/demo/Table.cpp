@@ -87,6 +87,18 @@ std::string PrintableCut(KTString const &text, std::size_t width) {
     return Printable(start.substr(0, pos)) + "…";
 }
 
+std::string PrintableTail(KTString const &text, std::size_t width) {
+    if (text.size() <= width * 2 && DisplayWidth(text) <= width) {
+        return Printable(text);
+    }
+    // Marks without a width may make this a little shorter than it could be.
+    KTString tail = text.substr(text.size() - std::min(text.size(), width - 1));
+    while (!tail.empty() && (IsLow(tail[0]) || DisplayWidth(tail) > width - 1)) {
+        tail = tail.substr(1);
+    }
+    return "…" + Printable(tail);
+}
+
 std::size_t DisplayWidth(KTString const &text) {
     std::size_t width = 0;
     std::size_t units = 0;

@@ -14,6 +14,9 @@ std::string Printable(KTString const &text);
 /// Printable, cut to `width` columns with an ellipsis at its end.
 std::string PrintableCut(KTString const &text, std::size_t width);
 
+/// Printable, cut to its last `width` columns behind an ellipsis: of a long path, the end tells most.
+std::string PrintableTail(KTString const &text, std::size_t width);
+
 /// Columns that the text takes in a terminal: East Asian letters and emoji take two, combining marks none.
 std::size_t DisplayWidth(KTString const &text);
 

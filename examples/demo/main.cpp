@@ -45,6 +45,9 @@ int Run(Console const &console, Options const &options) {
 
     CourseFolder const folder = FindCourseFiles(path);
     log.Step("files found: " + std::to_string(folder.files.size()));
+    if (folder.files.empty() && folder.notes.empty()) {
+        return Fail(console, log, "nothing to read in " + shownPath);
+    }
     std::vector<TextResult> const results = ReadCourse(folder.files, log);
 
     ReportLimits limits;
