@@ -60,7 +60,8 @@ class Workers {
     Workers(std::vector<TextResult> &results, RunLog &log) : m_Results(results), m_Log(log) {}
     Workers(Workers const &) = delete;
     Workers &operator=(Workers const &) = delete;
-    ~Workers() {
+    // A queue that could not be closed would never let its threads end: then the process ends instead.
+    ~Workers() { // NOLINT(bugprone-exception-escape)
         m_Queue.Close();
         m_Threads.join_all();
     }

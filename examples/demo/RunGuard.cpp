@@ -10,7 +10,7 @@
 RunGuard::RunGuard() : m_Path(KTFileUtil::GetSystemTempFolder().GetPath()) {
     m_Path.Append(KTString("ktdemo.lock"));
     DiskTouch(m_Path); // if this fails, the lock says why
-    m_Lock.emplace(m_Path.GetPathAsKTString());
+    m_Lock = std::make_unique<KTInterProcessFileLock>(m_Path.GetPathAsKTString());
     m_IsHeld = m_Lock->TryLock();
 }
 

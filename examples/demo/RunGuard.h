@@ -5,7 +5,7 @@
 #include "KTInterProcessFileLock.h"
 #include "KTPath.h"
 
-#include <optional>
+#include <memory>
 
 /// Holds the lock on "ktdemo.lock" in the system's temporary folder. The file stays there: if each run deleted it, a
 /// run could lock a file that the next one no longer finds.
@@ -25,6 +25,6 @@ class RunGuard {
 
   private:
     KTPath m_Path;
-    std::optional<KTInterProcessFileLock> m_Lock;
+    std::unique_ptr<KTInterProcessFileLock> m_Lock;
     bool m_IsHeld = false;
 };

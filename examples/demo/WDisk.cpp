@@ -28,7 +28,7 @@ template <typename Handle> Handle Owned(HANDLE handle) {
 
 // The extended form of a full path; it is the only one without a limit of 260 characters.
 std::wstring Extended(KTPath const &path) {
-    std::wstring const text = path.GetPathAsKTString().GetWstring();
+    std::wstring text = path.GetPathAsKTString().GetWstring();
     if (text.starts_with(L"\\\\?\\") || text.starts_with(L"\\\\.\\")) {
         return text;
     }
