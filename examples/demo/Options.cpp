@@ -1,0 +1,43 @@
+// Options.cpp: the command line of ktdemo.
+
+#include "Options.h"
+
+char const *UsageText() {
+    return "usage: ktdemo [--all] [FOLDER]\n"
+           "\n"
+           "Reads every text file below FOLDER (here: the current folder) with the KTPublic library and prints what "
+           "it\n"
+           "found: encodings, counts, captions and the texts of string dictionaries side by side. Nothing in FOLDER "
+           "is\n"
+           "changed. Text files are *.txt, *.ini, *.csv, *.srt, *.vtt, *.xml, *.md and *.json; others are listed with\n"
+           "their sizes.\n"
+           "\n"
+           "  --all     print every row; else long tables are cut after 100\n"
+           "  --help    print this text\n"
+           "\n"
+           "Exit status: 0 done, 1 no such folder or nothing readable in it, 2 wrong usage.\n";
+}
+
+Options ParseOptions(std::vector<KTString> const &arguments) {
+    Options options;
+    bool onlyFolders = false;
+    bool hasFolder = false;
+    for (KTString const &argument : arguments) {
+        bool const isOption = !onlyFolders && argument.size() > 1 && argument[0] == '-';
+        if (isOption && argument == "--") {
+            onlyFolders = true;
+        } else if (isOption && (argument == "--help" || argument == "-h")) {
+            options.help = true;
+        } else if (isOption && argument == "--all") {
+            options.all = true;
+        } else if (isOption) {
+            options.error = "unknown option: " + argument.GetUTF8String();
+        } else if (hasFolder) {
+            options.error = "more than one folder given";
+        } else {
+            options.folder = argument;
+            hasFolder = true;
+        }
+    }
+    return options;
+}

@@ -1,0 +1,30 @@
+// ReadCourse.h: reads a course's text files with several threads.
+
+#pragma once
+
+#include "CourseFiles.h"
+#include "CourseText.h"
+#include "RunLog.h"
+#include "TextFacts.h"
+
+#include <string>
+#include <vector>
+
+/// What reading one text file gave.
+struct TextResult {
+    CourseFile file;
+    std::string encoding;
+    std::vector<std::string> notes;
+    TextFacts facts;
+    bool isRead = false;         ///< else the notes say why not
+    bool hasFileName = false;    ///< whether its name may be given to a file on every system
+    bool numbersSurvive = false; ///< see NumbersSurvive
+    std::vector<DictionaryEntry> entries;
+    std::vector<Cue> cues;
+};
+
+/// Reads up to this much of each file; more is not text that an author wrote.
+constexpr KTUInt64 kMostBytes = 32ULL << 20;
+
+/// Reads the text files among `files`. The results have the files' order.
+std::vector<TextResult> ReadCourse(std::vector<CourseFile> const &files, RunLog &log);

@@ -1,0 +1,93 @@
+// main.cpp: ktdemo, a small host of the KTPublic library. It reads the text files of a course and shows what the library
+// makes of them; the capabilities follow one another in Run.
+
+#include "CourseFiles.h"
+#include "Options.h"
+#include "ReadCourse.h"
+#include "Report.h"
+#include "RunGuard.h"
+#include "RunLog.h"
+#include "Table.h"
+#include "WConsole.h"
+#include "WDisk.h"
+
+#include <algorithm>
+#include <exception>
+#include <limits>
+
+namespace {
+
+constexpr int kDone = 0;
+constexpr int kNothing = 1;
+constexpr int kUsage = 2;
+
+int Fail(Console const &console, RunLog &log, std::string const &message) {
+    log.Step(message);
+    console.PrintError(message);
+    return kNothing;
+}
+
+int Run(Console const &console, Options const &options) {
+    RunLog log;
+    RunGuard const guard;
+    if (!guard.IsHeld()) {
+        // The run that holds the lock owns the log.
+        console.PrintError("another ktdemo is running (it holds " + Printable(guard.FilePath().GetPathAsKTString()) +
+                           ")");
+        return kNothing;
+    }
+    KTPath const path = DiskFullPath(options.folder);
+    std::string const shownPath = Printable(path.GetPathAsKTString());
+    if (!DiskIsFolder(path)) {
+        return Fail(console, log, "no such folder: " + Printable(options.folder));
+    }
+    log.Step("folder: " + shownPath);
+
+    CourseFolder const folder = FindCourseFiles(path);
+    log.Step("files found: " + std::to_string(folder.files.size()));
+    if (folder.files.empty() && folder.notes.empty()) {
+        return Fail(console, log, "nothing to read in " + shownPath);
+    }
+    std::vector<TextResult> const results = ReadCourse(folder.files, log);
+
+    ReportLimits limits;
+    if (options.all) {
+        limits.rows = limits.texts = std::numeric_limits<std::size_t>::max();
+    }
+    console.Print("Course folder: " + shownPath + "\n\n");
+    console.Print(ReportTexts(results, limits));
+    console.Print(ReportCaptions(results));
+    console.Print(ReportDictionaries(results, limits));
+    console.Print(ReportOtherFiles(folder, limits));
+    console.Print(ReportChecks(results));
+
+    bool const anyRead = std::any_of(results.begin(), results.end(), [](auto const &result) { return result.isRead; });
+    bool const onlyOthers = results.empty() && !folder.files.empty();
+    if (!anyRead && !onlyOthers) {
+        return Fail(console, log, "nothing readable in " + shownPath);
+    }
+    log.Step("done");
+    console.Print(ReportLog(log));
+    return kDone;
+}
+
+} // namespace
+
+int wmain(int count, wchar_t **arguments) {
+    Console const console;
+    try {
+        Options const options = ParseOptions({arguments + std::min(count, 1), arguments + count});
+        if (!options.error.empty()) {
+            console.PrintError(options.error + " (ktdemo --help tells more)");
+            return kUsage;
+        }
+        if (options.help) {
+            console.Print(UsageText());
+            return kDone;
+        }
+        return Run(console, options);
+    } catch (std::exception const &problem) {
+        console.PrintError(std::string("stopped: ") + problem.what());
+        return kNothing;
+    }
+}

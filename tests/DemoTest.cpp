@@ -1,0 +1,363 @@
+// DemoTest.cpp: the demo host as a user meets it: run as a child process, judged by its output and exit status.
+//
+// The child gets a temporary folder of its own, as its start empties the log there.
+
+#include "KTInterProcessFileLock.h"
+
+#include <gtest/gtest.h>
+
+#include <windows.h>
+
+#include <algorithm>
+#include <filesystem>
+#include <fstream>
+#include <memory>
+#include <stdexcept>
+#include <string>
+#include <vector>
+
+namespace {
+
+namespace fs = std::filesystem;
+using std::string_literals::operator""s;
+
+struct CloseAnyHandle {
+    using pointer = HANDLE;
+    void operator()(HANDLE handle) const noexcept { CloseHandle(handle); }
+};
+using Handle = std::unique_ptr<HANDLE, CloseAnyHandle>;
+
+// Files instead of pipes would do as well, but a pipe is what most callers of a console program give it.
+struct Pipe {
+    Handle read;
+    Handle write;
+
+    Pipe() {
+        SECURITY_ATTRIBUTES inherited{sizeof inherited, nullptr, TRUE};
+        HANDLE readEnd = nullptr;
+        HANDLE writeEnd = nullptr;
+        constexpr DWORD kRoomForAll = 1U << 20; // both pipes are read one after the other: neither may fill up
+        if (CreatePipe(&readEnd, &writeEnd, &inherited, kRoomForAll) == FALSE) {
+            throw std::runtime_error("CreatePipe");
+        }
+        read.reset(readEnd);
+        write.reset(writeEnd);
+        SetHandleInformation(readEnd, HANDLE_FLAG_INHERIT, 0);
+    }
+
+    std::string ReadToEnd() {
+        write.reset(); // the child's end is the last one then
+        std::string text;
+        char part[4096];
+        DWORD got = 0;
+        while (ReadFile(read.get(), part, sizeof part, &got, nullptr) != FALSE && got != 0) {
+            text.append(part, got);
+        }
+        return text;
+    }
+};
+
+struct Outcome {
+    DWORD status = 0;
+    std::string out;
+    std::string err;
+
+    bool Has(std::string const &text) const { return out.find(text) != std::string::npos; }
+
+    // The line of the table whose first cell is `name`, each run of blanks made one.
+    std::string Row(std::string const &name) const {
+        std::size_t const start = out.find("\n  " + name + " ");
+        if (start == std::string::npos) {
+            return "";
+        }
+        std::string row = out.substr(start + 3, out.find('\n', start + 1) - start - 3);
+        row.erase(std::unique(row.begin(), row.end(), [](char a, char b) { return a == ' ' && b == ' '; }), row.end());
+        return row;
+    }
+};
+
+fs::path ProgramBesideThis() {
+    std::wstring self(32768, L'\0');
+    self.resize(GetModuleFileNameW(nullptr, self.data(), static_cast<DWORD>(self.size())));
+    return fs::path(self).replace_filename(L"ktdemo.exe");
+}
+
+std::wstring Quoted(std::wstring const &argument) { return L"\"" + argument + L"\""; }
+
+class Demo : public testing::Test {
+  protected:
+    Demo() {
+        static fs::path const ownTemp = fs::temp_directory_path();
+        m_Work = ownTemp / testing::UnitTest::GetInstance()->current_test_info()->name();
+        fs::remove_all(m_Work);
+        m_Temp = m_Work / "temp";
+        m_Folder = m_Work / "folder";
+        fs::create_directories(m_Temp);
+        fs::create_directories(m_Folder);
+        // Inherited by the child; this program's log is open already.
+        SetEnvironmentVariableW(L"TEMP", m_Temp.c_str());
+        SetEnvironmentVariableW(L"TMP", m_Temp.c_str());
+    }
+
+    void Write(fs::path const &name, std::string const &bytes) const {
+        fs::create_directories((m_Folder / name).parent_path());
+        std::ofstream(m_Folder / name, std::ios::binary) << bytes;
+    }
+
+    static Outcome Run(std::wstring const &arguments) {
+        Pipe out;
+        Pipe err;
+        STARTUPINFOW startup{};
+        startup.cb = sizeof startup;
+        startup.dwFlags = STARTF_USESTDHANDLES;
+        startup.hStdOutput = out.write.get();
+        startup.hStdError = err.write.get();
+        PROCESS_INFORMATION information{};
+        std::wstring command = Quoted(ProgramBesideThis().wstring()) + L" " + arguments;
+        if (CreateProcessW(nullptr, command.data(), nullptr, nullptr, TRUE, 0, nullptr, nullptr, &startup,
+                           &information) == FALSE) {
+            throw std::runtime_error("cannot start ktdemo, error " + std::to_string(GetLastError()));
+        }
+        Handle const process(information.hProcess);
+        Handle const thread(information.hThread);
+        Outcome outcome;
+        outcome.out = out.ReadToEnd();
+        outcome.err = err.ReadToEnd();
+        WaitForSingleObject(process.get(), INFINITE);
+        GetExitCodeProcess(process.get(), &outcome.status);
+        return outcome;
+    }
+
+    Outcome RunOnFolder() const { return Run(Quoted(m_Folder.wstring())); }
+
+    fs::path m_Work;
+    fs::path m_Temp;   // the child's temporary folder
+    fs::path m_Folder; // a folder to run it on
+};
+
+Outcome CheckEmptyError(Outcome outcome) {
+    EXPECT_TRUE(outcome.err.empty()) << outcome.err;
+    return outcome;
+}
+
+std::size_t Lines(std::string const &text) {
+    return static_cast<std::size_t>(std::count(text.begin(), text.end(), '\n'));
+}
+
+std::string ReadAll(fs::path const &path) {
+    std::ifstream stream(path, std::ios::binary);
+    return {std::istreambuf_iterator<char>(stream), {}};
+}
+
+TEST_F(Demo, CourseTextsAreCountedExactly) {
+    Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
+    EXPECT_EQ(outcome.status, 0U);
+    EXPECT_EQ(outcome.Row("File"), "File Encoding Bytes Units Lines Words Non-ASCII U+FFFD Notes");
+    EXPECT_EQ(outcome.Row("settings.ini"), "settings.ini UTF-8 746 745 32 93 1 0");
+    EXPECT_EQ(outcome.Row("captions/intro.bytes.txt"), "captions/intro.bytes.txt bytes 523 523 8 86 6 0");
+    EXPECT_EQ(outcome.Row("captions/intro.utf16.txt"), "captions/intro.utf16.txt UTF-16 LE 1048 523 8 102 7 0");
+    EXPECT_EQ(outcome.Row("strings/en_US.txt"), "strings/en_US.txt UTF-16 LE 1772 885 19 89 34 0");
+    EXPECT_EQ(outcome.Row("strings/de_DE.txt"), "strings/de_DE.txt UTF-16 LE 1866 932 19 87 39 0");
+    EXPECT_FALSE(outcome.Has("\xEF\xBF\xBD")) << "U+FFFD in well-formed text";
+}
+
+TEST_F(Demo, CourseCaptionsAreReadFromBothForms) {
+    Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
+    std::string const captions = outcome.out.substr(std::min(outcome.out.find("Captions\n"), outcome.out.size()));
+    EXPECT_NE(captions.find("intro.bytes.txt         8    42.00  Welcome to the harbour of Sankt Jürgen.\n"),
+              std::string::npos);
+    EXPECT_NE(captions.find("intro.utf16.txt         8    42.00  Welcome to the harbour of Sankt Jürgen.\n"),
+              std::string::npos);
+}
+
+TEST_F(Demo, CourseDictionariesStandSideBySide) {
+    Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
+    EXPECT_EQ(outcome.Row("Key"), "Key de_DE en_US");
+    EXPECT_EQ(outcome.Row("Course/Title"), "Course/Title Sicherheit im Hafen Harbour Safety");
+    EXPECT_EQ(outcome.Row("Page/Quay"), "Page/Quay „Abstand zur Kaikante halten“ “Keep clear of the edge”");
+    EXPECT_EQ(outcome.Row("Shop/Price"), "Shop/Price Schwimmweste, ab 49,90 € Life jacket, from €49.90");
+    EXPECT_EQ(outcome.Row("Glossary/Port"),
+              "Glossary/Port Hafen, auf Griechisch λιμάνι ⚓ 🚢 Port, in Greek λιμάνι ⚓ 🚢");
+    EXPECT_TRUE(outcome.Has("... and 7 texts more; --all shows everything\n"));
+    EXPECT_EQ(outcome.Row("Quiz/Failed"), "");
+    EXPECT_EQ(Run(L"--all \"" KT_COURSE L"\"").Row("Quiz/Failed"),
+              "Quiz/Failed Noch nicht: bitte noch einmal Not yet: try once more");
+}
+
+TEST_F(Demo, CoursePicturesAreListedWithTheirSizes) {
+    Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
+    EXPECT_TRUE(outcome.Row("pictures/panorama.png").ends_with(" 3000 x 400"));
+    EXPECT_TRUE(outcome.Row("pictures/lighthouse.png").ends_with(" 320 x 240"));
+    EXPECT_TRUE(outcome.Row("pictures/crane.png").ends_with(" 240 x 320"));
+    EXPECT_TRUE(outcome.Row("pictures/lifebuoy.png").ends_with(" 160 x 160"));
+    EXPECT_TRUE(outcome.Row("pictures/no_entry.png").ends_with(" 96 x 96"));
+}
+
+TEST_F(Demo, CourseChecksAllHold) {
+    Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
+    EXPECT_EQ(outcome.Row("pieces unchanged by UTF-8"), "pieces unchanged by UTF-8 and back 6 of 6");
+    EXPECT_EQ(outcome.Row("pieces unchanged by wide"), "pieces unchanged by wide and automation text 6 of 6");
+    EXPECT_EQ(outcome.Row("files whose"), "files whose counts can be written and read back 6 of 6");
+    EXPECT_EQ(outcome.Row("file names"), "file names that every system allows 6 of 6");
+    EXPECT_EQ(outcome.Row("dictionary texts"), "dictionary texts that could name a file 30 of 38");
+}
+
+TEST_F(Demo, LogIsWhereItSaysAndHasAsManyLines) {
+    Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
+    std::string const log = ReadAll(m_Temp / "ktap_log.txt");
+    std::string const count = std::to_string(Lines(log));
+    EXPECT_GT(Lines(log), 6U * 3U);
+    EXPECT_TRUE(outcome.Has("\n  " + count + " lines written, " + count + " in the file\n")) << outcome.out;
+    EXPECT_TRUE(outcome.Has("\\temp\\ktap_log.txt\n")) << outcome.out;
+    EXPECT_NE(log.find(": settings.ini: lines: 32, words: 93\n"), std::string::npos);
+    // Each line is whole, and every thread has written.
+    EXPECT_NE(log.find("worker 1: started\n"), std::string::npos);
+    EXPECT_NE(log.find("worker 2: started\n"), std::string::npos);
+    EXPECT_NE(log.find("worker 2: ended, files read: "), std::string::npos);
+    EXPECT_TRUE(fs::exists(m_Temp / "ktdemo.lock"));
+}
+
+TEST_F(Demo, SecondRunIsTurnedAway) {
+    std::ofstream(m_Temp / "ktdemo.lock").put('x');
+    KTInterProcessFileLock lock(KTString((m_Temp / "ktdemo.lock").c_str()));
+    ASSERT_TRUE(lock.TryLock());
+    Outcome const outcome = Run(L"\"" KT_COURSE L"\"");
+    EXPECT_EQ(outcome.status, 1U);
+    EXPECT_TRUE(outcome.err.starts_with("ktdemo: another ktdemo is running")) << outcome.err;
+    EXPECT_TRUE(outcome.out.empty());
+    lock.Unlock();
+    EXPECT_EQ(Run(L"\"" KT_COURSE L"\"").status, 0U);
+}
+
+TEST_F(Demo, EmptyFolderIsAnError) {
+    Outcome const outcome = RunOnFolder();
+    EXPECT_EQ(outcome.status, 1U);
+    EXPECT_TRUE(outcome.err.starts_with("ktdemo: nothing to read in ")) << outcome.err;
+    EXPECT_EQ(Lines(outcome.err), 1U);
+    EXPECT_TRUE(outcome.out.empty()) << outcome.out;
+}
+
+TEST_F(Demo, MissingFolderIsAnError) {
+    Outcome const outcome = Run(Quoted((m_Work / "no such").wstring()));
+    EXPECT_EQ(outcome.status, 1U);
+    EXPECT_TRUE(outcome.err.starts_with("ktdemo: no such folder: ")) << outcome.err;
+    EXPECT_EQ(Lines(outcome.err), 1U);
+    Write("file.txt", "x");
+    EXPECT_EQ(Run(Quoted((m_Folder / "file.txt").wstring())).status, 1U) << "a file is no folder";
+    EXPECT_EQ(Run(L"\"\"").status, 1U);
+}
+
+TEST_F(Demo, EveryEncodingIsFound) {
+    Write("be.txt", "\xFE\xFF\0G\0r\0\xF6\0\xDF\0e"s);
+    Write("le.txt", "\xFF\xFEG\0r\0\xF6\0\xDF\0e\0"s);
+    Write("plain16.csv", "a\0;\0b\0\r\0\n\0"s);
+    Write("plain16be.csv", "\0a\0;\0b\0\n"s);
+    Write("mark.json", "\xEF\xBB\xBF{\"price\": \"\xE2\x82\xAC\"}\n");
+    Write("eight.md", "Gr\xC3\xB6\xC3\x9F"
+                      "e\n");
+    Write("single.srt", "Gr\xF6\xDF"
+                        "e\n");
+    Write("old.vtt", "one\rtwo\rthree");
+    Outcome const outcome = CheckEmptyError(RunOnFolder());
+    EXPECT_EQ(outcome.status, 0U);
+    EXPECT_EQ(outcome.Row("be.txt"), "be.txt UTF-16 BE 12 5 1 1 2 0");
+    EXPECT_EQ(outcome.Row("le.txt"), "le.txt UTF-16 LE 12 5 1 1 2 0");
+    EXPECT_EQ(outcome.Row("plain16.csv"), "plain16.csv UTF-16 LE 10 5 1 1 0 0");
+    EXPECT_EQ(outcome.Row("plain16be.csv"), "plain16be.csv UTF-16 BE 8 4 1 1 0 0");
+    EXPECT_EQ(outcome.Row("mark.json"), "mark.json UTF-8 BOM 20 15 1 2 1 0");
+    EXPECT_EQ(outcome.Row("eight.md"), "eight.md UTF-8 8 6 1 1 2 0");
+    EXPECT_EQ(outcome.Row("single.srt"), "single.srt bytes 6 6 1 1 2 0");
+    EXPECT_EQ(outcome.Row("old.vtt"), "old.vtt UTF-8 13 13 3 3 0 0");
+}
+
+TEST_F(Demo, JunkIsReadAndNoted) {
+    Write("odd.txt", "\xFF\xFEH\0i\0!"s);
+    Write("lone.txt", "\xFF\xFE"
+                      "A\0\0\xD8"
+                      "B\0"s);
+    Write("bad.txt", "\xC3\xA4 \xC3\xB6 \xC3\xBC \xE2\x82\xAC \xFF \xE2\x82 end\n");
+    Write("zeros.txt", "a\0b\0\0c"s);
+    Write("nothing.xml", "");
+    Write("percent.txt", "%s%n\n\"$$$/\n\"$$$/a\n1|x\n1|99999999999|y\n");
+    Write("fake.png", "no picture");
+    Write("other.bin", "\0\1\2"s);
+    Outcome const outcome = CheckEmptyError(RunOnFolder());
+    EXPECT_EQ(outcome.status, 0U);
+    EXPECT_EQ(outcome.Row("odd.txt"), "odd.txt UTF-16 LE 7 2 1 1 0 0 odd last byte left out");
+    EXPECT_EQ(outcome.Row("lone.txt"), "lone.txt UTF-16 LE 8 3 1 1 1 0 unpaired surrogates");
+    EXPECT_EQ(outcome.Row("bad.txt"), "bad.txt UTF-8 22 16 1 7 6 2");
+    EXPECT_EQ(outcome.Row("zeros.txt"), "zeros.txt UTF-8 6 6 1 1 0 0 zero units");
+    EXPECT_EQ(outcome.Row("nothing.xml"), "nothing.xml empty 0 0 0 0 0 0");
+    EXPECT_EQ(outcome.Row("fake.png"), "fake.png 10 not a PNG picture");
+    EXPECT_EQ(outcome.Row("other.bin"), "other.bin 3");
+    EXPECT_EQ(outcome.Row("pieces unchanged by UTF-8"), "pieces unchanged by UTF-8 and back 4 of 5");
+    EXPECT_FALSE(outcome.Has("Captions\n"));
+    EXPECT_FALSE(outcome.Has("Dictionary\n"));
+}
+
+TEST_F(Demo, NamesBeyondAsciiAndDeepTreesAreWalked) {
+    fs::path const name = u8"Größe 港 €/Ünter.TXT";
+    Write(name, "na\xC3\xAFve\n");
+    // The system's calls refuse more than 260 characters unless the path has its extended form.
+    std::wstring deep = L"\\\\?\\" + m_Folder.wstring();
+    for (int level = 0; level < 12; ++level) {
+        deep += L"\\a folder with a long name, " + std::to_wstring(level);
+        ASSERT_NE(CreateDirectoryW(deep.c_str(), nullptr), FALSE) << GetLastError();
+    }
+    deep += L"\\deep.txt";
+    Handle(CreateFileW(deep.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_NEW, 0, nullptr)).reset();
+    Outcome const outcome = CheckEmptyError(RunOnFolder());
+    EXPECT_EQ(outcome.Row("Größe 港 €/Ünter.TXT"), "Größe 港 €/Ünter.TXT UTF-8 7 6 1 1 1 0");
+    EXPECT_TRUE(outcome.Has("name, 11/deep.txt  empty")) << outcome.out;
+    Outcome const inside = CheckEmptyError(Run(Quoted((m_Folder / name).parent_path().wstring())));
+    EXPECT_EQ(inside.Row("Ünter.TXT"), "Ünter.TXT UTF-8 7 6 1 1 1 0");
+    EXPECT_TRUE(inside.out.starts_with("Course folder: ")) << inside.out;
+}
+
+TEST_F(Demo, FolderMayBeGivenWithForwardSlashes) {
+    Write("a.txt", "one two\n");
+    std::wstring const slashes = m_Folder.generic_wstring();
+    EXPECT_EQ(Run(Quoted(slashes)).Row("a.txt"), "a.txt UTF-8 8 8 1 2 0 0");
+    EXPECT_EQ(Run(Quoted(slashes + L"/")).Row("a.txt"), "a.txt UTF-8 8 8 1 2 0 0");
+    EXPECT_EQ(Run(L"-- " + Quoted(slashes)).status, 0U);
+}
+
+TEST_F(Demo, FileInUseIsNotedAndTheOthersAreRead) {
+    Write("free.txt", "one\n");
+    Write("used.txt", "two\n");
+    Handle const used(CreateFileW((m_Folder / "used.txt").c_str(), GENERIC_READ | GENERIC_WRITE, 0, nullptr,
+                                  OPEN_EXISTING, 0, nullptr));
+    Outcome const outcome = RunOnFolder();
+    EXPECT_EQ(outcome.status, 0U);
+    EXPECT_EQ(outcome.Row("used.txt"), "used.txt - 4 - - - - - in use");
+    EXPECT_EQ(outcome.Row("free.txt"), "free.txt UTF-8 4 4 1 1 0 0");
+    fs::remove(m_Folder / "free.txt");
+    Outcome const nothing = RunOnFolder();
+    EXPECT_EQ(nothing.status, 1U);
+    EXPECT_TRUE(nothing.err.starts_with("ktdemo: nothing readable in ")) << nothing.err;
+    EXPECT_EQ(nothing.Row("used.txt"), "used.txt - 4 - - - - - in use");
+}
+
+TEST_F(Demo, HugeFileIsCutBetweenCharacters) {
+    // A character of three bytes lies across the limit of 32 MiB.
+    constexpr std::size_t kLimit = 32U << 20;
+    std::string bytes(kLimit + 10, 'x');
+    bytes.replace(kLimit - 1, 3, "\xE2\x82\xAC");
+    Write("huge.txt", bytes);
+    Outcome const outcome = CheckEmptyError(RunOnFolder());
+    EXPECT_EQ(outcome.Row("huge.txt"), "huge.txt UTF-8 33554442 33554431 1 1 0 0 only the first 32 MiB");
+}
+
+TEST_F(Demo, HelpAndWrongUsage) {
+    Outcome const help = CheckEmptyError(Run(L"--help"));
+    EXPECT_EQ(help.status, 0U);
+    EXPECT_TRUE(help.out.starts_with("usage: ktdemo [--all] [FOLDER]\n"));
+    for (wchar_t const *arguments : {L"--bogus", L"one two"}) {
+        Outcome const outcome = Run(arguments);
+        EXPECT_EQ(outcome.status, 2U);
+        EXPECT_TRUE(outcome.out.empty());
+        EXPECT_EQ(Lines(outcome.err), 1U) << outcome.err;
+    }
+}
+
+} // namespace
