@@ -26,7 +26,9 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const *data, std::size_t size
     Check(KTString(bytes.c_str(), KTString::kKTEncodingBytes).size() == std::strlen(bytes.c_str()));
 
     Units units(size / 2);
-    std::memcpy(units.data(), data, units.size() * 2);
+    if (!units.empty()) {
+        std::memcpy(units.data(), data, units.size() * 2);
+    }
     KTString const text = FromUnits(units);
     Check(text.GetUTF8String() == ReferenceEncode(units));
     Check(KTString(text.c_str()).size() == KTUnitTraits::length(text.c_str()));

@@ -52,10 +52,10 @@ class WImportHook {
   private:
     void *Write(void *value) {
         DWORD protection = 0;
-        VirtualProtect(m_Entry, sizeof *m_Entry, PAGE_READWRITE, &protection);
+        VirtualProtect(static_cast<void *>(m_Entry), sizeof *m_Entry, PAGE_READWRITE, &protection);
         void *const previous = *m_Entry;
         *m_Entry = value;
-        VirtualProtect(m_Entry, sizeof *m_Entry, protection, &protection);
+        VirtualProtect(static_cast<void *>(m_Entry), sizeof *m_Entry, protection, &protection);
         return previous;
     }
 

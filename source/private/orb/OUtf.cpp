@@ -523,7 +523,8 @@ KTUnits OWidenSigned(std::string_view bytes) {
     KTUnits units;
     FillExactly(units, bytes.size(), [&](Unit *to) {
         for (char const byte : bytes) {
-            *to++ = static_cast<Unit>(static_cast<signed char>(byte));
+            *to++ = static_cast<Unit>(
+                static_cast<short>(static_cast<signed char>(byte))); // NOLINT(bugprone-signed-char-misuse)
         }
     });
     return units;

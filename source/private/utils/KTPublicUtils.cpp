@@ -4,7 +4,9 @@
 
 #include <sstream>
 
-std::string KTPublicUtils::ConstructLogStr(std::string text, float value) {
+// By value, as its callers link it.
+std::string KTPublicUtils::ConstructLogStr(std::string text,
+                                           float value) { // NOLINT(performance-unnecessary-value-param)
     std::ostringstream stream;
     stream << text << ": " << value;
     return stream.str();

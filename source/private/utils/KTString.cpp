@@ -107,6 +107,8 @@ KTString::KTString(wchar_t const *text) : m_Units(FromWide(text)) {}
 
 KTString::KTString(OString const &text) : m_Units(text.GetUnits()) {}
 
+// By value, as its callers link it.
+// NOLINTNEXTLINE(performance-unnecessary-value-param)
 KTString::KTString(CComBSTR text, KTUInt32 length) : m_Units(FromBStr(text, length)) {}
 
 std::string KTString::GetUTF8String() const { return OUnitsToUtf8(m_Units.data(), m_Units.size()); }

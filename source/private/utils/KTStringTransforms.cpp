@@ -30,8 +30,9 @@ KTBool16 KTString::IsPermissableFileName() const {
 }
 
 KTString &KTString::ReplaceAll(KTString const &find, KTString const &with) {
-    KTString const needle = find; // the caller may hand in this string itself
-    KTString const replacement = with;
+    // Copies, as the caller may hand in this string itself.
+    KTString const needle = find;      // NOLINT(performance-unnecessary-copy-initialization)
+    KTString const replacement = with; // NOLINT(performance-unnecessary-copy-initialization)
     // Each search begins anew, so that what a replacement creates is replaced too. Nothing was found before the last
     // occurrence, and the next one can at most begin a needle's length before it: starting there finds the same.
     size_type at = m_Units.find(needle.m_Units);

@@ -177,21 +177,21 @@ class KT_PUBLIC_API KTString {
     size_type rfind(unsigned short const *units, size_type from = npos) const;
     size_type rfind(unsigned short const *units, size_type from, size_type count) const;
     size_type rfind(unsigned short unit, size_type from = npos) const;
-    size_type find_first_of(KTString const &set, size_type from = 0) const;
-    size_type find_first_of(unsigned short const *set, size_type from = 0) const;
-    size_type find_first_of(unsigned short const *set, size_type from, size_type count) const;
+    size_type find_first_of(KTString const &text, size_type from = 0) const;
+    size_type find_first_of(unsigned short const *units, size_type from = 0) const;
+    size_type find_first_of(unsigned short const *units, size_type from, size_type count) const;
     size_type find_first_of(unsigned short unit, size_type from = 0) const;
-    size_type find_last_of(KTString const &set, size_type from = npos) const;
-    size_type find_last_of(unsigned short const *set, size_type from = npos) const;
-    size_type find_last_of(unsigned short const *set, size_type from, size_type count) const;
+    size_type find_last_of(KTString const &text, size_type from = npos) const;
+    size_type find_last_of(unsigned short const *units, size_type from = npos) const;
+    size_type find_last_of(unsigned short const *units, size_type from, size_type count) const;
     size_type find_last_of(unsigned short unit, size_type from = npos) const;
-    size_type find_first_not_of(KTString const &set, size_type from = 0) const;
-    size_type find_first_not_of(unsigned short const *set, size_type from = 0) const;
-    size_type find_first_not_of(unsigned short const *set, size_type from, size_type count) const;
+    size_type find_first_not_of(KTString const &text, size_type from = 0) const;
+    size_type find_first_not_of(unsigned short const *units, size_type from = 0) const;
+    size_type find_first_not_of(unsigned short const *units, size_type from, size_type count) const;
     size_type find_first_not_of(unsigned short unit, size_type from = 0) const;
-    size_type find_last_not_of(KTString const &set, size_type from = npos) const;
-    size_type find_last_not_of(unsigned short const *set, size_type from = npos) const;
-    size_type find_last_not_of(unsigned short const *set, size_type from, size_type count) const;
+    size_type find_last_not_of(KTString const &text, size_type from = npos) const;
+    size_type find_last_not_of(unsigned short const *units, size_type from = npos) const;
+    size_type find_last_not_of(unsigned short const *units, size_type from, size_type count) const;
     size_type find_last_not_of(unsigned short unit, size_type from = npos) const;
 
     /// Negative, 0 or positive as this string (or `count` of its units at `pos`) sorts before, with or after the other.
