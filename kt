@@ -160,7 +160,12 @@ configure() {
 compile() {
     local folder=$1
     shift
-    ninja -C "$root/build/$folder" --quiet "$@" || fail "the build of $folder failed"
+    local output
+    # ninja writes compiler messages to its standard output; they matter only when something failed or warned.
+    output=$(ninja -C "$root/build/$folder" --quiet "$@") || {
+        printf '%s\n' "$output" >&2
+        fail "the build of $folder failed"
+    }
 }
 
 # ---- commands ----
