@@ -93,6 +93,10 @@ KTUnits Joined(KTUnits const &left, Unit const *right, Size count) {
 
 } // namespace
 
+// Hosts that bind a reference to the constant, as std::min does, import it: this definition puts it into the library,
+// which inline variables alone do not.
+constexpr KTString::size_type KTString::npos; // NOLINT(readability-redundant-declaration)
+
 KTString::size_type KTString::GetNPos() { return npos; }
 
 // ---- construction and conversion ----
