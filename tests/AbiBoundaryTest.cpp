@@ -21,10 +21,14 @@ using namespace ktabi;
 
 namespace {
 
-// Whether the block lies in the heap that this program's own allocations come from, with room for `size` bytes.
+// The heap that this program's own allocations come from.
+HANDLE OwnHeap() {
+    return reinterpret_cast<HANDLE>(_get_heap_handle()); // NOLINT(performance-no-int-to-ptr)
+}
+
+// Whether the block lies in that heap, with room for `size` bytes.
 bool IsInOwnHeap(void *block, std::size_t size) {
-    auto *const heap = reinterpret_cast<HANDLE>(_get_heap_handle());
-    return HeapValidate(heap, 0, block) != FALSE && HeapSize(heap, 0, block) >= size;
+    return HeapValidate(OwnHeap(), 0, block) != FALSE && HeapSize(OwnHeap(), 0, block) >= size;
 }
 
 struct HostError {
@@ -66,7 +70,7 @@ TEST(AbiBoundaryTest, HostsMemoryIsFreedByTheLibrary) {
     EXPECT_TRUE(IsInOwnHeap(block, 1000));
     Deallocate(block);
     Deallocate(nullptr);
-    EXPECT_NE(FALSE, HeapValidate(reinterpret_cast<HANDLE>(_get_heap_handle()), 0, nullptr));
+    EXPECT_NE(FALSE, HeapValidate(OwnHeap(), 0, nullptr));
 }
 
 TEST(AbiBoundaryTest, FilesAreCreatedHereAndDestroyedThere) {
@@ -81,7 +85,7 @@ TEST(AbiBoundaryTest, FilesAreCreatedHereAndDestroyedThere) {
     EXPECT_TRUE(IsInOwnHeap(derived, sizeof(HostFile)));
     delete derived;
     EXPECT_TRUE(destroyed);
-    EXPECT_NE(FALSE, HeapValidate(reinterpret_cast<HANDLE>(_get_heap_handle()), 0, nullptr));
+    EXPECT_NE(FALSE, HeapValidate(OwnHeap(), 0, nullptr));
 }
 
 TEST(AbiBoundaryTest, FilesComeFromTheLibrarysAllocation) {

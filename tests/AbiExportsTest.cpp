@@ -104,7 +104,7 @@ TEST(AbiExportsTest, AreThoseOfTheList) {
 TEST(AbiExportsTest, DataAreReachedThroughTheHeaders) {
     EXPECT_EQ(static_cast<void *>(&gKTLogger), Symbol(Library(), "gKTLogger"));
     EXPECT_EQ(static_cast<void *>(&WKTLogger::creator), Symbol(Library(), "_ZN9WKTLogger7creatorE"));
-    EXPECT_FALSE(IsCode(&gKTLogger));
+    EXPECT_FALSE(IsCode(static_cast<void const *>(&gKTLogger)));
     EXPECT_FALSE(IsCode(&WKTLogger::creator));
     EXPECT_NE(nullptr, gKTLogger);
 }

@@ -28,7 +28,7 @@ namespace {
 // The pointer at an offset of an object.
 void *PointerAt(void const *object, std::size_t offset) {
     void *pointer = nullptr;
-    std::memcpy(&pointer, static_cast<std::byte const *>(object) + offset, sizeof pointer);
+    std::memcpy(static_cast<void *>(&pointer), static_cast<std::byte const *>(object) + offset, sizeof pointer);
     return pointer;
 }
 
@@ -50,7 +50,7 @@ template <typename Handle> void ExpectHandle(Handle &first, Handle &second) {
 
     auto *const implementation = first.get();
     auto *const otherImplementation = second.get();
-    Place<Handle> place;
+    Place<Handle> place{};
     std::memset(place.bytes, 0xAB, sizeof place.bytes);
     auto *const copy = ::new (place.bytes) Handle(first);
     EXPECT_EQ(ExportedTable<Handle>(), PointerAt(copy, 0));
@@ -92,7 +92,7 @@ TEST(AbiLayoutTest, HandlesAreATableAndOnePointerAndCopiesShareIt) {
 TEST(AbiLayoutTest, ACopiedLockIsTheSameLock) {
     KTMutex mutex;
     KTLock lock(mutex);
-    Place<KTLock> place;
+    Place<KTLock> place{};
     auto *const copy = ::new (place.bytes) KTLock(lock);
     copy->unlock();
     EXPECT_ANY_THROW(lock.unlock());
@@ -108,7 +108,7 @@ TEST(AbiLayoutTest, LoggersFieldsStandInOrder) {
     std::byte before[sizeof(KTLogger)];
     std::memcpy(before, bytes, sizeof before);
     ASSERT_TRUE(gKTLogger->IsLogEnabled());
-    EXPECT_EQ(std::byte{1}, bytes[8]);
+    ASSERT_EQ(std::byte{1}, bytes[8]);
     gKTLogger->LogEnableAtRuntime(false);
     EXPECT_EQ(std::byte{0}, bytes[8]);
     before[8] = std::byte{0};
@@ -119,7 +119,7 @@ TEST(AbiLayoutTest, LoggersFieldsStandInOrder) {
     std::ofstream const stream;
     void const *const loggersStream = PointerAt(gKTLogger, 16);
     ASSERT_NE(nullptr, loggersStream);
-    EXPECT_EQ(TableOfObject(&stream), TableOfObject(loggersStream));
+    ASSERT_EQ(TableOfObject(&stream), TableOfObject(loggersStream));
     EXPECT_TRUE(static_cast<std::ofstream const *>(loggersStream)->is_open());
 
     EXPECT_EQ(ExportedTable<KTMutex>(), PointerAt(gKTLogger, 24));

@@ -87,7 +87,7 @@ inline void *FollowImport(void *code) {
     std::int32_t offset = 0;
     std::memcpy(&offset, bytes + 2, sizeof offset);
     void *target = nullptr;
-    std::memcpy(&target, bytes + 6 + offset, sizeof target);
+    std::memcpy(static_cast<void *>(&target), bytes + 6 + offset, sizeof target);
     return target;
 }
 
