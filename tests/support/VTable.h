@@ -13,6 +13,7 @@
 // Slots are written as the demangled name of the function that the entry leads to, with these short forms:
 //
 //     "~"      the class's own destructor, two entries
+//     "inline" a function that a header defines, which has no exported name: any code will do, so call it in a test
 //     "pure"   a function without an implementation in this class: null, as the linker leaves the compiler's weak
 //              reference to the function that would report such a call, or that function
 //     "pure ~" the destructor of a class with such functions, two entries of the same kind: no object has this table
@@ -109,18 +110,30 @@ inline std::vector<std::string> ExpectedEntries(VTableSpec const &spec) {
     return entries;
 }
 
-/// Whether an entry holds the function of that name: "pure", an exported symbol or its demangled form.
-inline bool IsFunction(void *code, std::string const &name, std::vector<Export> const &exports) {
-    if (name == "pure") {
-        return code == nullptr ||
-               FollowImport(code) == Symbol(GetModuleHandleW(L"libstdc++-6.dll"), "__cxa_pure_virtual");
-    }
+/// Whether one of the exports is that code under that name, a symbol or its demangled form.
+inline bool IsExportedAs(void const *code, std::string const &name, std::vector<Export> const &exports) {
     for (Export const &one : exports) {
         if (one.address == code && (one.symbol == name || one.text == name)) {
             return true;
         }
     }
     return false;
+}
+
+/// Whether an entry holds the function of that name, the library's own or one inherited from the standard library.
+inline bool IsFunction(void *code, std::string const &name, std::vector<Export> const &exports) {
+    HMODULE const standardLibrary = GetModuleHandleW(L"libstdc++-6.dll");
+    if (name == "pure") {
+        return code == nullptr || FollowImport(code) == Symbol(standardLibrary, "__cxa_pure_virtual");
+    }
+    if (code == nullptr || name == "inline") {
+        return code != nullptr;
+    }
+    if (IsExportedAs(code, name, exports)) {
+        return true;
+    }
+    void *const imported = FollowImport(code);
+    return imported != code && IsExportedAs(imported, name, ReadExports(standardLibrary));
 }
 
 /// All exported names of an address, for messages.
