@@ -122,7 +122,8 @@ need_source() {
     : >"$stamps/source-$package"
 }
 
-# The project's own Wine prefix: no display, Windows 10, nothing of it outside build/.
+# The project's own Wine prefix: no display, Windows 10, nothing of it outside build/. Wine's debugger, which waits for
+# ever without a display, is replaced by a program that does not exist: a crash then ends the program at once.
 need_wine() {
     [ -e "$stamps/wine" ] && return
     echo "kt: preparing the Wine prefix"
@@ -132,7 +133,9 @@ need_wine() {
     {
         "$root/cmake/wine-run" wineboot --init &&
             "$root/cmake/wine-run" reg add 'HKCU\Software\Wine\Drivers' /v Graphics /d null /f &&
-            "$root/cmake/wine-run" reg add 'HKCU\Software\Wine' /v Version /d win10 /f
+            "$root/cmake/wine-run" reg add 'HKCU\Software\Wine' /v Version /d win10 /f &&
+            "$root/cmake/wine-run" reg add 'HKLM\Software\Microsoft\Windows NT\CurrentVersion\AeDebug' \
+                /v Debugger /d none /f
     } >"$log" 2>&1 </dev/null || fail "could not prepare the Wine prefix (build/setup/wine.log)"
     : >"$stamps/wine"
 }

@@ -93,6 +93,7 @@ KTUnits Joined(KTUnits const &left, Unit const *right, Size count) {
 
 } // namespace
 
+// Hosts that bind a reference to the constant, as std::min does, import it.
 KTString::size_type const KTString::npos;
 
 KTString::size_type KTString::GetNPos() { return npos; }

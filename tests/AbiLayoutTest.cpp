@@ -1,0 +1,160 @@
+// AbiLayoutTest.cpp: what hosts' compiled code knows of objects and values: sizes, offsets and numbers.
+//
+//     handle (KTMutex, KTRecursiveMutex, KTLock, KTRecursiveLock, KTCondition, KTInterProcessFileLock), 16 bytes
+//          0  virtual table
+//          8  the owned implementation object
+//
+//     KTLogger, 80 bytes
+//          0  virtual table
+//          8  bool             writing is enabled
+//         16  std::ofstream *  the log file
+//         24  KTMutex
+//         40  KTPath           the log file's path, up to 80
+
+#include "KTPublic.h"
+#include "VTable.h"
+
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <fstream>
+#include <new>
+#include <type_traits>
+
+using namespace ktabi;
+
+namespace {
+
+// The pointer at an offset of an object.
+void *PointerAt(void const *object, std::size_t offset) {
+    void *pointer = nullptr;
+    std::memcpy(static_cast<void *>(&pointer), static_cast<std::byte const *>(object) + offset, sizeof pointer);
+    return pointer;
+}
+
+// Memory for a handle whose destructor must not run, because another handle owns the implementation.
+template <typename Handle> struct Place {
+    alignas(Handle) std::byte bytes[sizeof(Handle)];
+};
+
+// `first` and `second` each own an implementation; both are left as they were.
+template <typename Handle> void ExpectHandle(Handle &first, Handle &second) {
+    SCOPED_TRACE(typeid(Handle).name());
+    EXPECT_EQ(16U, sizeof(Handle));
+    EXPECT_EQ(8U, alignof(Handle));
+    EXPECT_TRUE(std::has_virtual_destructor_v<Handle>);
+    EXPECT_EQ(ExportedTable<Handle>(), PointerAt(&first, 0));
+    EXPECT_NE(nullptr, PointerAt(&first, 8));
+    EXPECT_EQ(static_cast<void *>(first.get()), PointerAt(&first, 8));
+    EXPECT_NE(first.get(), second.get());
+
+    auto *const implementation = first.get();
+    auto *const otherImplementation = second.get();
+    Place<Handle> place{};
+    std::memset(place.bytes, 0xAB, sizeof place.bytes);
+    auto *const copy = ::new (place.bytes) Handle(first);
+    EXPECT_EQ(ExportedTable<Handle>(), PointerAt(copy, 0));
+    EXPECT_EQ(static_cast<void *>(implementation), PointerAt(copy, 8));
+    EXPECT_EQ(implementation, first.get());
+
+    // A handle that is assigned to forgets its implementation without destroying it, so `copy` may stand in here.
+    Handle *const result = &(*copy = second);
+    EXPECT_EQ(copy, result);
+    EXPECT_EQ(static_cast<void *>(otherImplementation), PointerAt(copy, 8));
+    EXPECT_EQ(implementation, first.get());
+    EXPECT_EQ(otherImplementation, second.get());
+}
+
+TEST(AbiLayoutTest, HandlesAreATableAndOnePointerAndCopiesShareIt) {
+    KTMutex mutexes[2];
+    ExpectHandle(mutexes[0], mutexes[1]);
+    KTRecursiveMutex recursiveMutexes[2];
+    ExpectHandle(recursiveMutexes[0], recursiveMutexes[1]);
+    KTCondition conditions[2];
+    ExpectHandle(conditions[0], conditions[1]);
+    KTLock lock(mutexes[0]);
+    KTLock otherLock(mutexes[1]);
+    ExpectHandle(lock, otherLock);
+    lock.unlock(); // would throw if a copy had released it
+    otherLock.unlock();
+    KTRecursiveLock recursiveLock(recursiveMutexes[0]);
+    KTRecursiveLock otherRecursiveLock(recursiveMutexes[1]);
+    ExpectHandle(recursiveLock, otherRecursiveLock);
+    recursiveLock.unlock();
+    otherRecursiveLock.unlock();
+    KTString const existing = gKTLogger->GetLogFilePath().GetPathAsKTString();
+    KTInterProcessFileLock fileLock(existing);
+    KTInterProcessFileLock otherFileLock(existing);
+    ExpectHandle(fileLock, otherFileLock);
+}
+
+// Two handles with one implementation are one lock: what the copy releases, the original no longer owns.
+TEST(AbiLayoutTest, ACopiedLockIsTheSameLock) {
+    KTMutex mutex;
+    KTLock lock(mutex);
+    Place<KTLock> place{};
+    auto *const copy = ::new (place.bytes) KTLock(lock);
+    copy->unlock();
+    EXPECT_ANY_THROW(lock.unlock());
+    lock.lock();
+    EXPECT_ANY_THROW(copy->lock());
+}
+
+TEST(AbiLayoutTest, LoggersFieldsStandInOrder) {
+    auto const *const bytes = reinterpret_cast<std::byte const *>(gKTLogger);
+    EXPECT_EQ(80U, sizeof(KTLogger));
+    EXPECT_EQ(sizeof(KTLogger), sizeof(WKTLogger));
+
+    std::byte before[sizeof(KTLogger)];
+    std::memcpy(before, bytes, sizeof before);
+    ASSERT_TRUE(gKTLogger->IsLogEnabled());
+    ASSERT_EQ(std::byte{1}, bytes[8]);
+    gKTLogger->LogEnableAtRuntime(false);
+    EXPECT_EQ(std::byte{0}, bytes[8]);
+    before[8] = std::byte{0};
+    EXPECT_EQ(0, std::memcmp(before, bytes, sizeof before)) << "more than the flag has changed";
+    gKTLogger->LogEnableAtRuntime(true);
+    EXPECT_EQ(std::byte{1}, bytes[8]);
+
+    std::ofstream const stream;
+    void const *const loggersStream = PointerAt(gKTLogger, 16);
+    ASSERT_NE(nullptr, loggersStream);
+    ASSERT_EQ(TableOfObject(&stream), TableOfObject(loggersStream));
+    EXPECT_TRUE(static_cast<std::ofstream const *>(loggersStream)->is_open());
+
+    EXPECT_EQ(ExportedTable<KTMutex>(), PointerAt(gKTLogger, 24));
+    EXPECT_EQ(ExportedTable<KTPath>(), PointerAt(gKTLogger, 40));
+    EXPECT_EQ(static_cast<void const *>(bytes + 40), static_cast<void const *>(&gKTLogger->GetLogFilePath()));
+}
+
+TEST(AbiLayoutTest, NumbersAreFixed) {
+    EXPECT_EQ(0, static_cast<int>(kKTErrorNone));
+    EXPECT_EQ(1, static_cast<int>(kKTErrorFailed));
+    EXPECT_EQ(28, static_cast<int>(kKTErrorFileNotFound));
+    EXPECT_EQ(4U, sizeof(KTErrorCodeEnum));
+    EXPECT_EQ(0, static_cast<int>(KTString::kKTEncodingBytes));
+    EXPECT_EQ(1, static_cast<int>(KTString::kKTEncodingUTF8));
+    EXPECT_EQ(4U, sizeof(KTString::KTCharEncodingType));
+    EXPECT_EQ(0xFFFFFFFFFFFFFFFFULL, KTString::npos);
+    EXPECT_EQ(0xFFFFFFFFFFFFFFFFULL, KTString::GetNPos());
+    EXPECT_EQ(8U, sizeof(KTString::size_type));
+}
+
+TEST(AbiLayoutTest, TypesAreFixed) {
+    EXPECT_TRUE((std::is_same_v<KTBool16, short>));
+    EXPECT_TRUE((std::is_same_v<KTInt32, int>));
+    EXPECT_TRUE((std::is_same_v<KTUInt32, unsigned int>));
+    EXPECT_TRUE((std::is_same_v<KTInt64, long long>));
+    EXPECT_TRUE((std::is_same_v<KTUInt64, unsigned long long>));
+    EXPECT_TRUE((std::is_same_v<KTString::value_type, unsigned short>));
+    EXPECT_TRUE((std::is_same_v<decltype(KTString().Contains(KTString())), KTBool16>));
+    EXPECT_EQ(2U, sizeof(wchar_t));
+    EXPECT_EQ(8U, sizeof(KTReal));
+    EXPECT_EQ(sizeof(KTUnits), sizeof(KTString));
+    EXPECT_EQ(sizeof(KTUnits), sizeof(OString));
+    EXPECT_EQ(sizeof(void *), sizeof(CComBSTR));
+    EXPECT_EQ(8U + sizeof(KTUnits), sizeof(KTPath));
+    EXPECT_EQ(8U + sizeof(KTUnits), sizeof(KTFile));
+}
+
+} // namespace

@@ -1,0 +1,160 @@
+// AbiTest.cpp: the virtual tables of the exported classes: which function stands in which entry, how long each table
+// is, and that a class derived by the host takes part.
+//
+// A new class with virtual functions is one more line of kTables. Slots are listed in the order that hosts rely on,
+// written down here and not derived from the headers.
+
+#include "KTPublic.h"
+#include "VTable.h"
+
+#include <gtest/gtest.h>
+
+#include <new>
+#include <utility>
+
+using namespace ktabi;
+
+namespace {
+
+VTableSpec const kTables[] = {
+    VTableOf<KTLogger>(
+        {"pure", "pure", "KTLogger::Log(std::string const&)", "KTLogger::Log(char const*, ...)", "pure ~"}),
+    VTableOf<WKTLogger>({"WKTLogger::Log(std::wstring const&)", "WKTLogger::Log(wchar_t const*, ...)",
+                         "WKTLogger::Log(std::string const&)", "KTLogger::Log(char const*, ...)", "~"}),
+    VTableOf<KTPath>({"~"}),
+    VTableOf<KTFile>({"~", "KTFile::PathChanged(OString const&)"}),
+    VTableOf<KTMutex>({"~"}),
+    VTableOf<KTRecursiveMutex>({"~"}),
+    VTableOf<KTLock>({"~"}),
+    VTableOf<KTRecursiveLock>({"~"}),
+    VTableOf<KTCondition>({"~"}),
+    VTableOf<KTInterProcessFileLock>({"~"}),
+};
+
+constexpr std::size_t kCompleteDestructor = 0; // entries of a class whose first slot is its destructor
+constexpr std::size_t kDeletingDestructor = 1;
+constexpr std::size_t kLoggerDestructor = 4;
+
+// Derived from an exported class as a host would; says when its own destructor runs.
+template <typename Base> class Watched : public Base {
+  public:
+    template <typename... Arguments> explicit Watched(bool &destroyed, Arguments &&...arguments)
+        : Base(std::forward<Arguments>(arguments)...), m_Destroyed(destroyed) {}
+    Watched(Watched const &) = delete;
+    Watched &operator=(Watched const &) = delete;
+    ~Watched() override { m_Destroyed = true; }
+
+  private:
+    bool &m_Destroyed;
+};
+
+// Destroys one derived object by each of the first two entries.
+template <typename Base, typename... Arguments> void ExpectDestructorFirst(Arguments &&...arguments) {
+    using Derived = Watched<Base>;
+    bool destroyed = false;
+    alignas(Derived) std::byte place[sizeof(Derived)];
+    Base *const placed = ::new (place) Derived(destroyed, arguments...);
+    CallEntry(placed, kCompleteDestructor);
+    EXPECT_TRUE(destroyed) << typeid(Base).name();
+
+    destroyed = false;
+    Base *const allocated = new Derived(destroyed, arguments...);
+    CallEntry(allocated, kDeletingDestructor);
+    EXPECT_TRUE(destroyed) << typeid(Base).name();
+}
+
+// A host's logger: keeps what it is given instead of writing it.
+class HostLogger : public KTLogger {
+  public:
+    explicit HostLogger(bool &destroyed) : m_Destroyed(destroyed) {}
+    HostLogger(HostLogger const &) = delete;
+    HostLogger &operator=(HostLogger const &) = delete;
+    ~HostLogger() override { m_Destroyed = true; }
+
+    using KTLogger::Log;
+    void Log(std::wstring const &) override { last = "wide text"; }
+    void Log(wchar_t const *const, ...) override { last = "wide format"; }
+    void Log(std::string const &message) override { last = message; }
+
+    std::string last;
+
+  private:
+    bool &m_Destroyed;
+};
+
+class VTableTest : public testing::TestWithParam<VTableSpec> {};
+
+TEST_P(VTableTest, HoldsTheSlotsInOrderAndNothingElse) { EXPECT_EQ("", CheckVTable(GetParam())); }
+
+INSTANTIATE_TEST_SUITE_P(AbiTest, VTableTest, testing::ValuesIn(kTables),
+                         [](auto const &one) { return "Class" + one.param.mangledClass; });
+
+TEST(AbiTest, ObjectsPointToTheLibrarysTables) {
+    KTMutex mutex;
+    KTRecursiveMutex recursiveMutex;
+    KTLock const lock(mutex);
+    KTRecursiveLock const recursiveLock(recursiveMutex);
+    KTCondition const condition;
+    KTPath const path;
+    KTFile const file;
+    EXPECT_EQ(ExportedTable<KTMutex>(), TableOfObject(&mutex));
+    EXPECT_EQ(ExportedTable<KTRecursiveMutex>(), TableOfObject(&recursiveMutex));
+    EXPECT_EQ(ExportedTable<KTLock>(), TableOfObject(&lock));
+    EXPECT_EQ(ExportedTable<KTRecursiveLock>(), TableOfObject(&recursiveLock));
+    EXPECT_EQ(ExportedTable<KTCondition>(), TableOfObject(&condition));
+    EXPECT_EQ(ExportedTable<KTPath>(), TableOfObject(&path));
+    EXPECT_EQ(ExportedTable<KTFile>(), TableOfObject(&file));
+    EXPECT_EQ(ExportedTable<WKTLogger>(), TableOfObject(gKTLogger));
+}
+
+// The header's declarations give hosts' calls their entries, so they must count as the library does.
+TEST(AbiTest, HostsCallTheLoggersSlotsByTheSameEntries) {
+    EXPECT_EQ(0U, EntryOf<void (KTLogger::*)(std::wstring const &)>(&KTLogger::Log));
+    EXPECT_EQ(1U, EntryOf<void (KTLogger::*)(wchar_t const *, ...)>(&KTLogger::Log));
+    EXPECT_EQ(2U, EntryOf<void (KTLogger::*)(std::string const &)>(&KTLogger::Log));
+    EXPECT_EQ(3U, EntryOf<void (KTLogger::*)(char const *, ...)>(&KTLogger::Log));
+}
+
+TEST(AbiTest, DerivedDestructorsRunThroughTheFirstSlot) {
+    KTMutex mutex;
+    KTRecursiveMutex recursiveMutex;
+    ExpectDestructorFirst<KTPath>();
+    ExpectDestructorFirst<KTFile>();
+    ExpectDestructorFirst<KTMutex>();
+    ExpectDestructorFirst<KTRecursiveMutex>();
+    ExpectDestructorFirst<KTLock>(mutex);
+    ExpectDestructorFirst<KTRecursiveLock>(recursiveMutex);
+    ExpectDestructorFirst<KTCondition>();
+
+    std::wstring const lockedFile = gKTLogger->GetLogFilePath().GetPathAsKTString().GetWstring();
+    ExpectDestructorFirst<KTInterProcessFileLock>(KTString(lockedFile.c_str()));
+}
+
+// The destructor's own work is done too, behind the derived class's: a lock that is gone has released its mutex.
+TEST(AbiTest, DestroyingThroughTheTableReachesTheLibrarysDestructor) {
+    KTMutex mutex;
+    bool destroyed = false;
+    KTLock *const lock = new Watched<KTLock>(destroyed, mutex);
+    CallEntry(lock, kDeletingDestructor);
+    KTLock const again(mutex); // would block for ever otherwise
+    EXPECT_TRUE(destroyed);
+}
+
+TEST(AbiTest, HostsLoggerServesTheLibrarysInterface) {
+    bool destroyed = false;
+    auto *const host = new HostLogger(destroyed);
+    KTLogger *const logger = host;
+    logger->Log(std::wstring(L"x"));
+    EXPECT_EQ("wide text", host->last);
+    logger->Log(L"%d", 1);
+    EXPECT_EQ("wide format", host->last);
+    logger->Log(std::string("plain"));
+    EXPECT_EQ("plain", host->last);
+    // Inherited: the library formats and hands the line to the host's override.
+    logger->Log("%d and %s", 42, "text");
+    EXPECT_EQ("42 and text", host->last);
+    CallEntry(logger, kLoggerDestructor + 1);
+    EXPECT_TRUE(destroyed);
+}
+
+} // namespace

@@ -1,0 +1,152 @@
+# headers.cmake: what the public headers bring into a host's translation unit and what is exported of them.
+#
+#     cmake -DCOMPILER=... -DHEADERS=... -DEXPORTS=... -DWORK=... -P headers.cmake
+#
+# Checked: they leave no macro but those of the standard headers they include, they bring in neither the system's nor
+# Boost's headers, and each class and free function that they mark for export is in the list of exports.
+
+cmake_minimum_required(VERSION 3.25)
+file(MAKE_DIRECTORY ${WORK})
+file(GLOB public_headers ${HEADERS}/*.h)
+set(problems "")
+
+# collect(NAME): appends the standard headers that one of ours includes to `standard`, in the order of inclusion, which
+# the macros of some of them depend on.
+set(standard "")
+set(visited "")
+function(collect name)
+  if(name IN_LIST visited)
+    return()
+  endif()
+  list(APPEND visited ${name})
+  file(STRINGS ${HEADERS}/${name} includes REGEX "^[ \t]*#[ \t]*include")
+  foreach(include IN LISTS includes)
+    if(include MATCHES "<(.*)>")
+      list(APPEND standard ${CMAKE_MATCH_1})
+      if(CMAKE_MATCH_1 MATCHES "windows\\.h|boost")
+        string(APPEND problems "${name} includes <${CMAKE_MATCH_1}>\n")
+      endif()
+    elseif(include MATCHES "\"(.*)\"")
+      collect(${CMAKE_MATCH_1})
+    endif()
+  endforeach()
+  set(standard ${standard} PARENT_SCOPE)
+  set(visited ${visited} PARENT_SCOPE)
+  set(problems "${problems}" PARENT_SCOPE)
+endfunction()
+collect(KTPublic.h)
+list(REMOVE_DUPLICATES standard)
+foreach(header IN LISTS public_headers)
+  get_filename_component(name ${header} NAME)
+  if(NOT name IN_LIST visited)
+    string(APPEND problems "KTPublic.h does not include ${name}\n")
+  endif()
+endforeach()
+if(NOT standard)
+  message(FATAL_ERROR "found no headers in ${HEADERS}")
+endif()
+
+# preprocess(VARIABLE OPTIONS TEXT): the compiler's output for a translation unit.
+function(preprocess variable options text)
+  file(WRITE ${WORK}/unit.cpp "${text}")
+  execute_process(
+    COMMAND ${COMPILER} -std=c++20 ${options} -I${HEADERS} unit.cpp
+    WORKING_DIRECTORY ${WORK}
+    OUTPUT_VARIABLE output
+    ERROR_VARIABLE errors
+    RESULT_VARIABLE status)
+  if(NOT status EQUAL 0)
+    message(FATAL_ERROR "${errors}")
+  endif()
+  set(${variable} "${output}" PARENT_SCOPE)
+endfunction()
+
+# macros_of(VARIABLE TEXT): the macros that are defined behind the unit, sorted, with their values.
+function(macros_of variable text)
+  preprocess(output "-dM;-E" "${text}")
+  # Brackets and semicolons mean something to CMake's lists.
+  string(REPLACE ";" "<semicolon>" output "${output}")
+  string(REPLACE "[" "<open>" output "${output}")
+  string(REPLACE "]" "<close>" output "${output}")
+  string(REGEX REPLACE "\n$" "" output "${output}")
+  string(REPLACE "\n" ";" output "${output}")
+  list(SORT output)
+  set(${variable} "${output}" PARENT_SCOPE)
+endfunction()
+
+set(standard_includes "")
+foreach(include IN LISTS standard)
+  string(APPEND standard_includes "#include <${include}>\n")
+endforeach()
+
+foreach(surroundings "" "#include <windows.h>\n")
+  macros_of(without "${surroundings}${standard_includes}")
+  macros_of(with "${surroundings}${standard_includes}#include <KTPublic.h>\n")
+  macros_of(alone "${surroundings}#include <KTPublic.h>\n")
+  foreach(list with alone)
+    set(added ${${list}})
+    list(REMOVE_ITEM added ${without})
+    foreach(macro IN LISTS added)
+      string(APPEND problems "the headers leave \"${macro}\"\n")
+    endforeach()
+    set(removed ${without})
+    list(REMOVE_ITEM removed ${${list}})
+    foreach(macro IN LISTS removed)
+      string(APPEND problems "the headers take away \"${macro}\"\n")
+    endforeach()
+  endforeach()
+endforeach()
+
+preprocess(dependencies "-M" "#include <KTPublic.h>\n")
+if(NOT dependencies MATCHES "KTString\\.h")
+  message(FATAL_ERROR "the compiler names no dependencies: ${dependencies}")
+endif()
+string(REGEX MATCHALL "[^ \n]*(/boost/|windows\\.h|winbase\\.h|winnt\\.h|windef\\.h)[^ \n]*" foreign "${dependencies}")
+if(foreign)
+  string(APPEND problems "the headers bring in ${foreign}\n")
+endif()
+
+# Exports.
+file(STRINGS ${EXPORTS} exports)
+set(found 0)
+# expect_listed(WHAT PREFIX...): some line begins with one of the prefixes.
+macro(expect_listed what)
+  math(EXPR found "${found} + 1")
+  set(listed FALSE)
+  foreach(line IN LISTS exports)
+    foreach(prefix ${ARGN})
+      string(FIND "${line}" "${prefix}" at)
+      if(at EQUAL 0)
+        set(listed TRUE)
+      endif()
+    endforeach()
+  endforeach()
+  if(NOT listed)
+    string(APPEND problems "${what} is not exported\n")
+  endif()
+endmacro()
+
+foreach(header IN LISTS public_headers)
+  file(STRINGS ${header} lines REGEX "KT_PUBLIC_API")
+  foreach(line IN LISTS lines)
+    if(line MATCHES "^(class|struct) KT_PUBLIC_API ([A-Za-z0-9_]+)")
+      # A class without a function of its own still has a table.
+      set(name ${CMAKE_MATCH_2})
+      expect_listed("class ${name}" "${name}::" "data ${name}::" "data vtable for ${name}")
+    elseif(line MATCHES "^KT_PUBLIC_API [^(]*[ *&](operator[^(]+|[A-Za-z0-9_]+)\\(")
+      set(name ${CMAKE_MATCH_1})
+      expect_listed("function ${name}" "${name}(")
+    elseif(line MATCHES "^extern KT_PUBLIC_API .*[ *&]([A-Za-z0-9_]+);")
+      set(name ${CMAKE_MATCH_1})
+      expect_listed("datum ${name}" "data ${name}")
+    elseif(NOT line MATCHES "^ *(#|//)")
+      string(APPEND problems "cannot read the declaration \"${line}\"\n")
+    endif()
+  endforeach()
+endforeach()
+
+if(problems)
+  message(FATAL_ERROR "${problems}")
+endif()
+list(LENGTH standard count)
+message(STATUS "no macro left over ${count} standard headers; ${found} exported classes, functions and data are listed")

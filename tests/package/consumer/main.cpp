@@ -1,0 +1,33 @@
+// Uses some of the installed library and says from where it was loaded.
+
+#include <KTPublic.h>
+
+#include <windows.h>
+
+#include <cstdio>
+#include <exception>
+
+int main() {
+    KTMutex mutex;
+    KTLock lock(mutex);
+    KTString text("Gr\xC3\xB6\xC3\x9F"
+                  "e ");
+    text.AppendNumber(12);
+    std::printf("text %s, %d units\n", text.GetUTF8String().c_str(), static_cast<int>(text.size()));
+
+    try {
+        lock.lock();
+    } catch (std::exception const &error) {
+        std::printf("caught %s\n", error.what()[0] != 0 ? "an exception" : "nothing");
+    }
+
+    gKTLogger->Log("written by %s", "the consumer");
+    std::printf("log %s\n", gKTLogger->GetLogFilePath().GetPathAsKTString().GetUTF8String().c_str());
+
+    for (char const *const name : {"KTPublic.dll", "libstdc++-6.dll", "libgcc_s_seh-1.dll", "libwinpthread-1.dll"}) {
+        wchar_t path[MAX_PATH] = L"";
+        GetModuleFileNameW(GetModuleHandleA(name), path, MAX_PATH);
+        std::printf("loaded %ls\n", path);
+    }
+    return 0;
+}
