@@ -50,7 +50,7 @@ class HostFile : public KTFile {
 };
 
 TEST(AbiBoundaryTest, LibrarysMemoryIsFreedByTheHost) {
-    for (KTUInt64 const size : {0, 1, 100, 1 << 20}) {
+    for (KTUInt64 const size : {0U, 1U, 100U, 1U << 20}) {
         void *const block = Allocate(size);
         ASSERT_NE(nullptr, block);
         EXPECT_TRUE(IsInOwnHeap(block, size));

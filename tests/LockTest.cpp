@@ -10,7 +10,6 @@
 #include <atomic>
 #include <deque>
 #include <memory>
-#include <vector>
 
 namespace {
 
@@ -106,7 +105,7 @@ TEST(Lock, ManyMayBeHeldAtOnceAndReleasedInAnyOrder) {
     constexpr std::size_t kMany = 40; // more than a thread keeps spare blocks for
     std::deque<KTMutex> mutexes(kMany);
     for (int round = 0; round < 3; ++round) {
-        std::vector<std::unique_ptr<KTLock>> locks;
+        std::deque<std::unique_ptr<KTLock>> locks;
         for (KTMutex &mutex : mutexes) {
             locks.push_back(std::make_unique<KTLock>(mutex));
         }

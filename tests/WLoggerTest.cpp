@@ -180,6 +180,20 @@ TEST(LibraryLoad, TheLogWorksInAFolderOfAnyName) {
     EXPECT_TRUE(child.Log().ends_with(": only line\n")) << child.Log();
 }
 
+TEST(LibraryLoad, DISABLED_ChildDeletesTheLogger) {
+    std::filesystem::path const file(gKTLogger->GetLogFilePath().GetPathAsKTString().GetWstring());
+    gKTLogger->Log("last line");
+    std::error_code error;
+    EXPECT_FALSE(std::filesystem::remove(file, error)) << "open until the logger is deleted";
+    delete dynamic_cast<WKTLogger *>(gKTLogger);
+    EXPECT_TRUE(std::filesystem::remove(file, error));
+}
+
+TEST(LibraryLoad, ADeletedLoggerClosesItsFile) {
+    WChildProcess child("LibraryLoad.DISABLED_ChildDeletesTheLogger");
+    EXPECT_EQ(child.ExitStatus(), 0U);
+}
+
 // The division and multiplication by 1000 lose a unit at some clock readings, such as 1001, which shows that they are
 // done. A fresh process meets such a reading within its first seconds.
 TEST(LoggerNumber, DISABLED_ChildLogsAtALosingReading) {

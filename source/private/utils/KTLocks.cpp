@@ -12,16 +12,19 @@ KTMutex::KTMutex() : m_Impl(new KTMutexImpl) {}
 KTMutex::KTMutex(KTMutex const &other) = default;
 KTMutex &KTMutex::operator=(KTMutex const &other) = default;
 KTMutex::~KTMutex() { delete m_Impl; }
+KTMutexImpl *KTMutex::get() { return m_Impl; }
 
 KTRecursiveMutex::KTRecursiveMutex() : m_Impl(new KTRecursiveMutexImpl) {}
 KTRecursiveMutex::KTRecursiveMutex(KTRecursiveMutex const &other) = default;
 KTRecursiveMutex &KTRecursiveMutex::operator=(KTRecursiveMutex const &other) = default;
 KTRecursiveMutex::~KTRecursiveMutex() { delete m_Impl; }
+KTRecursiveMutexImpl *KTRecursiveMutex::get() { return m_Impl; }
 
 KTLock::KTLock(KTMutex &mutex) : m_Impl(new KTLockImpl(mutex.get()->get())) {}
 KTLock::KTLock(KTLock const &other) = default;
 KTLock &KTLock::operator=(KTLock const &other) = default;
 KTLock::~KTLock() { delete m_Impl; }
+KTLockImpl *KTLock::get() { return m_Impl; }
 
 void KTLock::lock() { m_Impl->get().lock(); }
 
@@ -31,6 +34,7 @@ KTRecursiveLock::KTRecursiveLock(KTRecursiveMutex &mutex) : m_Impl(new KTRecursi
 KTRecursiveLock::KTRecursiveLock(KTRecursiveLock const &other) = default;
 KTRecursiveLock &KTRecursiveLock::operator=(KTRecursiveLock const &other) = default;
 KTRecursiveLock::~KTRecursiveLock() { delete m_Impl; }
+KTRecursiveLockImpl *KTRecursiveLock::get() { return m_Impl; }
 
 void KTRecursiveLock::lock() { m_Impl->get().lock(); }
 
@@ -40,6 +44,7 @@ KTCondition::KTCondition() : m_Impl(new KTConditionImpl) {}
 KTCondition::KTCondition(KTCondition const &other) = default;
 KTCondition &KTCondition::operator=(KTCondition const &other) = default;
 KTCondition::~KTCondition() { delete m_Impl; }
+KTConditionImpl *KTCondition::get() { return m_Impl; }
 
 void KTCondition::wait(KTLock &lock) { m_Impl->get().wait(lock.get()->get()); }
 

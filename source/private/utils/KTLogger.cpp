@@ -39,6 +39,12 @@ KTLogger::KTLogger() : m_Enabled(true), m_LogFilePath(LogFilePath()) { m_Stream 
 
 KTLogger::~KTLogger() { m_Stream->close(); }
 
+bool KTLogger::IsLogEnabled() const { return m_Enabled; }
+
+void KTLogger::LogEnableAtRuntime(bool enable) { m_Enabled = enable; }
+
+KTPath const &KTLogger::GetLogFilePath() const { return m_LogFilePath; }
+
 void KTLogger::Log(std::string const &message) {
     if (!m_Enabled) {
         return;

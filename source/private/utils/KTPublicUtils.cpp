@@ -5,8 +5,8 @@
 #include <sstream>
 
 // By value, as its callers link it.
-std::string KTPublicUtils::ConstructLogStr(std::string text,
-                                           float value) { // NOLINT(performance-unnecessary-value-param)
+// NOLINTNEXTLINE(performance-unnecessary-value-param)
+std::string KTPublicUtils::ConstructLogStr(std::string text, float value) {
     std::ostringstream stream;
     stream << text << ": " << value;
     return stream.str();

@@ -4,6 +4,8 @@
 
 KTUserEventUtil::LogFunctionCallBack KTUserEventUtil::m_CallBack = nullptr;
 
+KTUserEventUtil &KTUserEventUtil::operator=(KTUserEventUtil const &other) = default;
+
 void KTUserEventUtil::RegisterLogFunctionCallBack(LogFunctionCallBack callBack) {
     if (callBack != nullptr) {
         m_CallBack = callBack;

@@ -41,6 +41,8 @@ KTInterProcessFileLock &KTInterProcessFileLock::operator=(KTInterProcessFileLock
 
 KTInterProcessFileLock::~KTInterProcessFileLock() { delete m_Impl; }
 
+KTInterProcessFileLockImpl *KTInterProcessFileLock::get() { return m_Impl; }
+
 bool KTInterProcessFileLock::TryLock() {
     OVERLAPPED start{};
     if (LockFileEx(m_Impl->file.Get(), LOCKFILE_EXCLUSIVE_LOCK | LOCKFILE_FAIL_IMMEDIATELY, 0, kWholeFile, kWholeFile,

@@ -38,7 +38,7 @@ class KT_PUBLIC_API KTInterProcessFileLock {
     bool Unlock();
 
     /// The owned record with the file handle.
-    KTInterProcessFileLockImpl *get() { return m_Impl; }
+    KTInterProcessFileLockImpl *get();
 
   private:
     KTInterProcessFileLockImpl *m_Impl;

@@ -34,7 +34,7 @@ class KT_PUBLIC_API KTMutex {
     virtual ~KTMutex();
 
     /// The owned implementation object.
-    KTMutexImpl *get() { return m_Impl; }
+    KTMutexImpl *get();
 
   private:
     KTMutexImpl *m_Impl;
@@ -50,7 +50,7 @@ class KT_PUBLIC_API KTRecursiveMutex {
     virtual ~KTRecursiveMutex();
 
     /// The owned implementation object.
-    KTRecursiveMutexImpl *get() { return m_Impl; }
+    KTRecursiveMutexImpl *get();
 
   private:
     KTRecursiveMutexImpl *m_Impl;
@@ -74,7 +74,7 @@ class KT_PUBLIC_API KTLock {
     void unlock();
 
     /// The owned implementation object.
-    KTLockImpl *get() { return m_Impl; }
+    KTLockImpl *get();
 
   private:
     KTLockImpl *m_Impl;
@@ -98,7 +98,7 @@ class KT_PUBLIC_API KTRecursiveLock {
     void unlock();
 
     /// The owned implementation object.
-    KTRecursiveLockImpl *get() { return m_Impl; }
+    KTRecursiveLockImpl *get();
 
   private:
     KTRecursiveLockImpl *m_Impl;
@@ -130,7 +130,7 @@ class KT_PUBLIC_API KTCondition {
     void notify_all();
 
     /// The owned implementation object.
-    KTConditionImpl *get() { return m_Impl; }
+    KTConditionImpl *get();
 
   private:
     KTConditionImpl *m_Impl;

@@ -45,13 +45,13 @@ class KT_PUBLIC_API KTLogger {
     virtual void Log(char const *const format, ...);
 
     /// Whether anything is written; true from the start.
-    bool IsLogEnabled() const { return m_Enabled; }
+    bool IsLogEnabled() const;
 
     /// Switches all writing on or off; the file stays open. Not locked: lines on their way may still be written.
-    void LogEnableAtRuntime(bool enable) { m_Enabled = enable; }
+    void LogEnableAtRuntime(bool enable);
 
     /// Full path of the log file, fixed at construction.
-    KTPath const &GetLogFilePath() const { return m_LogFilePath; }
+    KTPath const &GetLogFilePath() const;
 
   protected:
     /// Opens the log file and empties it.

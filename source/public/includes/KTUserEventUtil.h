@@ -19,6 +19,9 @@ class KT_PUBLIC_API KTUserEventUtil {
     /// Throws std::bad_alloc and whatever the callback throws.
     static void LogUserEvent(KTString const &first, KTString const &second, KTString const &third);
 
+    /// Does nothing, as the class has no data of its own. Any thread.
+    KTUserEventUtil &operator=(KTUserEventUtil const &other);
+
   private:
     static LogFunctionCallBack m_CallBack;
 };
