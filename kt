@@ -40,7 +40,7 @@ fail() {
 
 # ---- set-up ----
 
-# as_root COMMAND...: runs it as root, or says what is missing.
+# as_root COMMAND...: runs it as root; 77 if there is no way to.
 as_root() {
     if [ "$(id -u)" = 0 ]; then
         "$@"
@@ -68,12 +68,11 @@ need_packages() {
     done
     [ ${#missing[@]} = 0 ] && return
     command -v apt-get >/dev/null || fail "needs Debian's packages ${missing[*]}, and there is no apt-get here"
+    as_root true || fail "please install these packages as root: apt-get install ${missing[*]}"
     echo "kt: installing ${missing[*]}"
     status=0
     apt_install "${missing[@]}" >"$log" 2>&1 || status=$?
-    if [ $status = 77 ]; then
-        fail "please install these packages as root: apt-get install ${missing[*]}"
-    elif [ $status != 0 ]; then
+    if [ $status != 0 ]; then
         # The package lists may be missing or out of date.
         as_root apt-get update >>"$log" 2>&1 || fail "apt-get update failed: is the network there? (build/setup/apt.log)"
         apt_install "${missing[@]}" >>"$log" 2>&1 || fail "could not install ${missing[*]} (build/setup/apt.log)"
