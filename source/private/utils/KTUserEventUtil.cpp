@@ -4,7 +4,7 @@
 
 KTUserEventUtil::LogFunctionCallBack KTUserEventUtil::m_CallBack = nullptr;
 
-KTUserEventUtil &KTUserEventUtil::operator=(KTUserEventUtil const &other) = default;
+KTUserEventUtil &KTUserEventUtil::operator=(KTUserEventUtil const &) = default;
 
 void KTUserEventUtil::RegisterLogFunctionCallBack(LogFunctionCallBack callBack) {
     if (callBack != nullptr) {
