@@ -16,7 +16,7 @@ using namespace ktabi;
 
 namespace {
 
-VTableSpec const kTables[] = {
+VTableRow const kTables[] = {
     VTableOf<KTLogger>(
         {"pure", "pure", "KTLogger::Log(std::string const&)", "KTLogger::Log(char const*, ...)", "pure ~"}),
     VTableOf<WKTLogger>({"WKTLogger::Log(std::wstring const&)", "WKTLogger::Log(wchar_t const*, ...)",
@@ -82,7 +82,7 @@ class HostLogger : public KTLogger {
     bool &m_Destroyed;
 };
 
-class VTableTest : public testing::TestWithParam<VTableSpec> {};
+class VTableTest : public testing::TestWithParam<VTableRow> {};
 
 TEST_P(VTableTest, HoldsTheSlotsInOrderAndNothingElse) { EXPECT_EQ("", CheckVTable(GetParam())); }
 

@@ -1,6 +1,6 @@
 // VTable.h: reads the virtual tables of exported classes and compares them with a list of slots, one line a class.
 //
-//     VTableSpec const table = VTableOf<KTFile>({"~", "KTFile::PathChanged(OString const&)"});
+//     VTableRow const table = VTableOf<KTFile>({"~", "KTFile::PathChanged(OString const&)"});
 //     EXPECT_EQ("", CheckVTable(table));
 //
 // A table in memory, as the Itanium C++ ABI lays it out; an object's first word points to entry 0:
@@ -35,14 +35,14 @@
 namespace ktabi {
 
 /// One row of a list of tables.
-struct VTableSpec {
+struct VTableRow {
     std::string mangledClass;       ///< the class as symbols name it: "7KTMutex"
     std::vector<std::string> slots; ///< see the top of this file
     std::size_t entriesInHeader;    ///< entries according to the header that the host was compiled with
 };
 
 /// GoogleTest's name for a row.
-inline void PrintTo(VTableSpec const &spec, std::ostream *out) { *out << spec.mangledClass; }
+inline void PrintTo(VTableRow const &row, std::ostream *out) { *out << row.mangledClass; }
 
 /// The entry that a pointer to a virtual member function stands for; such a pointer's first word is 1 + 8 * entry.
 template <typename Member> std::size_t EntryOf(Member member) {
@@ -59,7 +59,7 @@ template <typename Class> class FirstFreeEntry : public Class {
 };
 
 /// Declares the slots of one class, in order.
-template <typename Class> VTableSpec VTableOf(std::initializer_list<char const *> slots) {
+template <typename Class> VTableRow VTableOf(std::initializer_list<char const *> slots) {
     return {typeid(Class).name(), {slots.begin(), slots.end()}, EntryOf(&FirstFreeEntry<Class>::KTAbiFirstFreeEntry)};
 }
 
@@ -93,11 +93,11 @@ inline void *FollowImport(void *code) {
 }
 
 /// The entries that the slots take, as symbols or demangled names.
-inline std::vector<std::string> ExpectedEntries(VTableSpec const &spec) {
-    bool const nested = spec.mangledClass.starts_with('N');
-    std::string const scope = nested ? spec.mangledClass.substr(1, spec.mangledClass.size() - 2) : spec.mangledClass;
+inline std::vector<std::string> ExpectedEntries(VTableRow const &row) {
+    bool const nested = row.mangledClass.starts_with('N');
+    std::string const scope = nested ? row.mangledClass.substr(1, row.mangledClass.size() - 2) : row.mangledClass;
     std::vector<std::string> entries;
-    for (std::string const &slot : spec.slots) {
+    for (std::string const &slot : row.slots) {
         if (slot == "~") {
             entries.push_back("_ZN" + scope + "D1Ev");
             entries.push_back("_ZN" + scope + "D0Ev");
@@ -149,20 +149,20 @@ inline std::string NamesOf(void const *code, std::vector<Export> const &exports)
 
 /// Reads the class's table in the library. Returns what is different from the list, one line each: entries, the
 /// table's length in the library and its length in the header; nothing if all is as declared.
-inline std::string CheckVTable(VTableSpec const &spec) {
+inline std::string CheckVTable(VTableRow const &row) {
     std::ostringstream problems;
-    void *const *const table = ExportedTable(spec.mangledClass);
+    void *const *const table = ExportedTable(row.mangledClass);
     if (table == nullptr) {
-        return "the library exports no table of " + spec.mangledClass + "\n";
+        return "the library exports no table of " + row.mangledClass + "\n";
     }
     if (table[-2] != nullptr) {
         problems << "the offset to the top is not 0\n";
     }
-    if (table[-1] != Symbol(Library(), ("_ZTI" + spec.mangledClass).c_str())) {
-        problems << "the type information is not that of " << spec.mangledClass << "\n";
+    if (table[-1] != Symbol(Library(), ("_ZTI" + row.mangledClass).c_str())) {
+        problems << "the type information is not that of " << row.mangledClass << "\n";
     }
     std::vector<Export> const exports = ReadExports(Library());
-    std::vector<std::string> const expected = ExpectedEntries(spec);
+    std::vector<std::string> const expected = ExpectedEntries(row);
     for (std::size_t i = 0; i < expected.size(); ++i) {
         if (table[i] != nullptr && !IsCode(table[i])) {
             problems << "the table ends at entry " << i << ", expected " << expected[i] << "\n";
@@ -176,8 +176,8 @@ inline std::string CheckVTable(VTableSpec const &spec) {
     if (IsCode(table[expected.size()])) {
         problems << "one more entry:" << NamesOf(table[expected.size()], exports) << "\n";
     }
-    if (spec.entriesInHeader != expected.size()) {
-        problems << "the header declares " << spec.entriesInHeader << " entries, expected " << expected.size() << "\n";
+    if (row.entriesInHeader != expected.size()) {
+        problems << "the header declares " << row.entriesInHeader << " entries, expected " << expected.size() << "\n";
     }
     return problems.str();
 }
