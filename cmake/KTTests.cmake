@@ -4,11 +4,18 @@
 # of its own, as the library keeps its log there. Natively only PORTABLE tests are built; they may use the library's
 # internal headers.
 
-add_subdirectory(/usr/src/googletest ${CMAKE_BINARY_DIR}/googletest EXCLUDE_FROM_ALL)
-foreach(target gtest gtest_main gmock gmock_main)
-  target_compile_options(${target} PRIVATE -w)
-  target_compile_features(${target} PUBLIC cxx_std_20)
-endforeach()
+# Debian packages GoogleTest as sources, which compile for any target; elsewhere it is installed.
+if(EXISTS /usr/src/googletest)
+  add_subdirectory(/usr/src/googletest ${CMAKE_BINARY_DIR}/googletest EXCLUDE_FROM_ALL)
+  foreach(target gtest gtest_main gmock gmock_main)
+    target_compile_options(${target} PRIVATE -w)
+    target_compile_features(${target} PUBLIC cxx_std_20)
+  endforeach()
+else()
+  find_package(GTest REQUIRED)
+  add_library(gtest ALIAS GTest::gtest)
+  add_library(gtest_main ALIAS GTest::gtest_main)
+endif()
 
 set(KT_WINE_RUN ${CMAKE_SOURCE_DIR}/cmake/wine-run)
 
