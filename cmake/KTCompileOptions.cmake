@@ -1,16 +1,17 @@
 # kt_compile_options: what every target of this project is compiled with.
 
 add_library(kt_compile_options INTERFACE)
+# Our own code is compiled as C++23, whose std::string::resize_and_overwrite saves clearing memory that is written anyway;
+# the headers need C++20 only. As a feature, because CMake's own option for a target's C++20 would override a plain one.
+target_compile_features(kt_compile_options INTERFACE cxx_std_23)
 
 if(MSVC)
-  # The working draft's option brings std::string::resize_and_overwrite; headers need C++20 only.
-  target_compile_options(kt_compile_options INTERFACE /std:c++latest /W4 /WX /utf-8 /permissive- /EHa)
+  target_compile_options(kt_compile_options INTERFACE /W4 /WX /utf-8 /permissive- /EHa)
   target_compile_definitions(kt_compile_options INTERFACE _CRT_SECURE_NO_WARNINGS)
 else()
   target_compile_options(
     kt_compile_options
-    INTERFACE -std=c++23
-              -Wall
+    INTERFACE -Wall
               -Wextra
               -Wpedantic
               -Wshadow
