@@ -5,13 +5,18 @@
 // half, so three table look-ups whose results are and-ed find them, and a comparison with the bytes two and three places
 // back finds the rest.
 //
-// The second pass needs no checks. It takes windows of twelve bytes: a bit for every byte that ends a character forms an
-// index of 12 bits, and a table says how to shuffle the window's first characters into equal lanes.
+// The second pass needs no checks. Every byte gets a lane of 16 bits in which its unit is computed as if a character began
+// there; a shuffle from a table then moves the lanes together that really give a unit. Characters of four bytes, which
+// give two, have their first unit in the lane of the first byte and their second in that of the second:
 //
-//     kind       characters   of bytes   lanes       condition
-//     narrow     6            1 to 2     16 bits     the first six characters are that short
-//     medium     4            1 to 3     32 bits     the first four are
-//     wide       3            1 to 4     32 bits     always: three characters fit into twelve bytes
+//     byte at the lane    the unit, from it and the two bytes after it (b, c)
+//     0xxxxxxx            00000000 0xxxxxxx
+//     110xxxxx            00000xxx xxbbbbbb
+//     1110xxxx            xxxxbbbb bbcccccc
+//     11110xxx            110110ww wwbbbbcc   where xxxbb = wwww + 1, from the upper bits of b and c
+//     10xxxxxx            110111bb bbcccccc   only after 11110xxx
+//
+// No step waits for the lengths of earlier characters, only for the place where the next unit goes.
 
 #include "OUtfSse41.h"
 
@@ -89,7 +94,8 @@ O_SSE41_INLINE __m128i ErrorsIn(__m128i bytes, __m128i previous) {
     __m128i const first = _mm_alignr_epi8(bytes, previous, 15);
     __m128i const firstHigh = _mm_shuffle_epi8(LoadTable(kFirstHigh), _mm_and_si128(_mm_srli_epi16(first, 4), nibble));
     __m128i const firstLow = _mm_shuffle_epi8(LoadTable(kFirstLow), _mm_and_si128(first, nibble));
-    __m128i const secondHigh = _mm_shuffle_epi8(LoadTable(kSecondHigh), _mm_and_si128(_mm_srli_epi16(bytes, 4), nibble));
+    __m128i const secondHigh =
+        _mm_shuffle_epi8(LoadTable(kSecondHigh), _mm_and_si128(_mm_srli_epi16(bytes, 4), nibble));
     __m128i const pairs = _mm_and_si128(_mm_and_si128(firstHigh, firstLow), secondHigh);
     // A byte two places after a lead of three or more, or three places after a lead of four, has its top bit set here;
     // just there two continuations in a row are right.
@@ -134,135 +140,72 @@ O_SSE41_INLINE void ScanWide(Scanner &s, Byte const *from) {
     s.previous = blocks[3];
 }
 
-// ---- the windows ----
+// ---- the conversion ----
 
-constexpr std::size_t kWindow = 12;
-constexpr std::size_t kNarrowShuffles = 64; // 2^6
-constexpr std::size_t kMediumShuffles = 81; // 3^4
-constexpr std::size_t kWideShuffles = 64;   // 4^3
-
-struct Window {
-    Byte shuffle;  // narrow ones first, then medium, then wide
-    Byte consumed; // bytes
+// How to move the lanes of eight bytes together whose bits are set.
+struct Packing {
+    Shuffle shuffle;
+    Byte units;
 };
 
-// Takes `count` lanes of characters up to `longest` bytes; `form` numbers the lengths in the base `longest`.
-constexpr Shuffle MakeShuffle(std::size_t form, std::size_t count, std::size_t longest, std::size_t laneSize) {
-    Shuffle shuffle{};
-    shuffle.fill(0x80); // a zero byte
-    std::size_t at = 0;
-    for (std::size_t lane = 0; lane < count; ++lane, form /= longest) {
-        std::size_t const length = form % longest + 1;
-        at += length;
-        for (std::size_t i = 0; i < length; ++i) {
-            shuffle[lane * laneSize + i] = static_cast<Byte>(at - 1 - i); // the last byte first
-        }
-    }
-    return shuffle;
-}
-
-constexpr auto MakeShuffles() {
-    std::array<Shuffle, kNarrowShuffles + kMediumShuffles + kWideShuffles> shuffles{};
-    std::size_t at = 0;
-    for (std::size_t form = 0; form < kNarrowShuffles; ++form) {
-        shuffles[at++] = MakeShuffle(form, 6, 2, 2);
-    }
-    for (std::size_t form = 0; form < kMediumShuffles; ++form) {
-        shuffles[at++] = MakeShuffle(form, 4, 3, 4);
-    }
-    for (std::size_t form = 0; form < kWideShuffles; ++form) {
-        shuffles[at++] = MakeShuffle(form, 3, 4, 4);
-    }
-    return shuffles;
-}
-
-// Tries to take `count` characters of up to `longest` bytes; `window.consumed` stays 0 where they are not there.
-constexpr Window TakeWindow(unsigned ends, std::size_t count, std::size_t longest, std::size_t firstShuffle) {
-    std::size_t form = 0;
-    std::size_t weight = 1;
-    std::size_t at = 0;
-    for (std::size_t i = 0; i < count; ++i, weight *= longest) {
-        std::size_t length = 1;
-        while (at + length <= kWindow && (ends >> (at + length - 1) & 1U) == 0) {
-            ++length;
-        }
-        if (length > longest || at + length > kWindow) {
-            return {0, 0};
-        }
-        form += (length - 1) * weight;
-        at += length;
-    }
-    return {static_cast<Byte>(firstShuffle + form), static_cast<Byte>(at)};
-}
-
-constexpr auto MakeWindows() {
-    std::array<Window, 1U << kWindow> windows{};
-    for (unsigned ends = 0; ends < windows.size(); ++ends) {
-        Window window = TakeWindow(ends, 6, 2, 0);
-        if (window.consumed == 0) {
-            window = TakeWindow(ends, 4, 3, kNarrowShuffles);
-        }
-        if (window.consumed == 0) {
-            window = TakeWindow(ends, 3, 4, kNarrowShuffles + kMediumShuffles);
-        }
-        windows[ends] = window;
-    }
-    return windows;
-}
-
-// Moves three lanes of 32 bits together: the lanes whose bit is set keep both halves, the others the lower one.
-constexpr auto MakePairPacking() {
-    std::array<Shuffle, 8> packing{};
-    for (unsigned pairs = 0; pairs < packing.size(); ++pairs) {
-        packing[pairs].fill(0x80);
-        std::size_t at = 0;
-        for (unsigned lane = 0; lane < 3; ++lane) {
-            unsigned const bytes = (pairs >> lane & 1U) != 0 ? 4 : 2;
-            for (unsigned i = 0; i < bytes; ++i) {
-                packing[pairs][at++] = static_cast<Byte>(lane * 4 + i);
+constexpr auto MakePackings() {
+    std::array<Packing, 256> packings{};
+    for (unsigned lanes = 0; lanes < packings.size(); ++lanes) {
+        Packing &packing = packings[lanes];
+        packing.shuffle.fill(0x80); // gives a zero byte
+        for (unsigned lane = 0; lane < 8; ++lane) {
+            if ((lanes >> lane & 1U) != 0) {
+                packing.shuffle[2U * packing.units] = static_cast<Byte>(2 * lane);
+                packing.shuffle[2U * packing.units + 1] = static_cast<Byte>(2 * lane + 1);
+                ++packing.units;
             }
         }
     }
-    return packing;
+    return packings;
 }
 
-alignas(kBlock) constexpr auto kShuffles = MakeShuffles();
-constexpr auto kWindows = MakeWindows();
-alignas(kBlock) constexpr auto kPairPacking = MakePairPacking();
-constexpr Byte kUnitsOfPairs[] = {3, 4, 4, 5, 4, 5, 5, 6};
+constexpr auto kPackings = MakePackings();
 
-O_SSE41_INLINE Unit *PutNarrow(__m128i lanes, Unit *to) {
-    __m128i const tail = _mm_and_si128(lanes, Words(0x007F));
-    __m128i const lead = _mm_srli_epi16(_mm_and_si128(lanes, Words(0x1F00)), 2);
-    Store(to, _mm_or_si128(tail, lead));
-    return to + 6;
+O_SSE41_INLINE __m128i LanesAt(Byte const *from) {
+    return _mm_cvtepu8_epi16(_mm_loadl_epi64(reinterpret_cast<__m128i const *>(from)));
 }
 
-O_SSE41_INLINE Unit *PutMedium(__m128i lanes, Unit *to) {
-    __m128i const tail = _mm_and_si128(lanes, Longs(0x00007F));
-    __m128i const middle = _mm_srli_epi32(_mm_and_si128(lanes, Longs(0x003F00)), 2);
-    __m128i const lead = _mm_srli_epi32(_mm_and_si128(lanes, Longs(0x0F0000)), 4);
-    __m128i const units = _mm_or_si128(_mm_or_si128(tail, middle), lead);
-    Store(to, _mm_packus_epi32(units, units));
-    return to + 4;
+// The longest characters of some bytes.
+enum class Longest { kTwo, kThree, kFour };
+
+// The unit of each of eight bytes.
+template <Longest kLongest> O_SSE41_INLINE __m128i UnitsAt(Byte const *from) {
+    __m128i const six = Words(0x3F);
+    __m128i const a = LanesAt(from);
+    __m128i const b = _mm_and_si128(LanesAt(from + 1), six);
+    __m128i const two = _mm_or_si128(_mm_slli_epi16(_mm_and_si128(a, Words(0x1F)), 6), b);
+    if constexpr (kLongest == Longest::kTwo) {
+        return _mm_blendv_epi8(a, two, _mm_cmpgt_epi16(a, Words(0x7F)));
+    }
+    __m128i const c = _mm_and_si128(LanesAt(from + 2), six);
+    __m128i const bc = _mm_or_si128(_mm_slli_epi16(b, 6), c);
+    __m128i const three = _mm_or_si128(_mm_slli_epi16(a, 12), bc);
+    __m128i const isThree = _mm_cmpgt_epi16(a, Words(0xDF));
+    __m128i longer = three;
+    if constexpr (kLongest == Longest::kFour) {
+        __m128i const abc = _mm_or_si128(_mm_slli_epi16(_mm_and_si128(a, Words(0x07)), 8), _mm_srli_epi16(bc, 4));
+        __m128i const high = _mm_add_epi16(abc, Words(0xD800 - (0x10000 >> 10)));
+        longer = _mm_blendv_epi8(three, high, _mm_cmpgt_epi16(a, Words(0xEF)));
+    }
+    __m128i const units = _mm_blendv_epi8(two, longer, isThree);
+    if constexpr (kLongest == Longest::kThree) {
+        return _mm_blendv_epi8(a, units, _mm_cmpgt_epi16(a, Words(0x7F)));
+    }
+    __m128i const low = _mm_or_si128(_mm_and_si128(bc, Words(0x3FF)), Words(0xDC00));
+    __m128i const lower = _mm_blendv_epi8(a, low, _mm_cmpgt_epi16(a, Words(0x7F)));
+    return _mm_blendv_epi8(lower, units, _mm_cmpgt_epi16(a, Words(0xBF)));
 }
 
-O_SSE41_INLINE Unit *PutWide(__m128i lanes, Unit *to) {
-    // The third byte from the end is a continuation or the lead of three, whose bit 5 does not count.
-    __m128i const leadOfThree = _mm_srli_epi32(_mm_and_si128(lanes, Longs(0x400000)), 1);
-    __m128i const third = _mm_srli_epi32(_mm_and_si128(_mm_xor_si128(lanes, leadOfThree), Longs(0x3F0000)), 4);
-    __m128i const tail = _mm_and_si128(lanes, Longs(0x7F));
-    __m128i const second = _mm_srli_epi32(_mm_and_si128(lanes, Longs(0x3F00)), 2);
-    __m128i const lead = _mm_srli_epi32(_mm_and_si128(lanes, Longs(0x07000000)), 6);
-    __m128i const points = _mm_or_si128(_mm_or_si128(tail, second), _mm_or_si128(third, lead));
-
-    __m128i const isPair = _mm_cmpgt_epi32(points, Longs(0xFFFF));
-    __m128i const high = _mm_add_epi32(_mm_srli_epi32(points, 10), Longs(0xD800 - (0x10000 >> 10)));
-    __m128i const low = _mm_slli_epi32(_mm_or_si128(_mm_and_si128(points, Longs(0x3FF)), Longs(0xDC00)), 16);
-    __m128i const units = _mm_blendv_epi8(points, _mm_or_si128(high, low), isPair);
-    unsigned const pairs = static_cast<unsigned>(_mm_movemask_ps(_mm_castsi128_ps(isPair))) & 7U;
-    Store(to, _mm_shuffle_epi8(units, LoadTable(kPairPacking[pairs])));
-    return to + kUnitsOfPairs[pairs];
+// Decodes the lanes of eight bytes that are set in the low bits of `lanes`. Writes eight units, whatever their number.
+template <Longest kLongest> O_SSE41_INLINE Unit *DecodeEight(Byte const *from, std::uint64_t lanes, Unit *to) {
+    Packing const &packing = kPackings[lanes & 0xFF];
+    Store(to, _mm_shuffle_epi8(UnitsAt<kLongest>(from), LoadTable(packing.shuffle)));
+    return to + packing.units;
 }
 
 O_INLINE void WidenBlock(__m128i bytes, Unit *to) {
@@ -273,64 +216,66 @@ O_INLINE void WidenBlock(__m128i bytes, Unit *to) {
 struct Position {
     Byte const *from;
     Unit *to;
+    std::uint64_t lowUnit; // 1 where the byte before `from` begins a character of four, whose second unit comes now
 };
-
-// Decodes a character or more of 64 bytes that hold not only ASCII, until `limit` bytes or a little more are taken.
-// REQUIRES: limit <= 48, so that every window finds its 16 bits of `ends`.
-O_SSE41_INLINE Position DecodeWindows(Position p, std::uint64_t ends, std::size_t limit) {
-    Byte const *const stop = p.from + limit;
-    do {
-        __m128i const bytes = Load(p.from);
-        if ((ends & 0xFFFF) == 0xFFFF) {
-            WidenBlock(bytes, p.to);
-            p.from += kBlock;
-            p.to += kBlock;
-            ends >>= kBlock;
-            continue;
-        }
-        Window const window = kWindows[ends & 0xFFF];
-        __m128i const lanes = _mm_shuffle_epi8(bytes, LoadTable(kShuffles[window.shuffle]));
-        if (window.shuffle < kNarrowShuffles) {
-            p.to = PutNarrow(lanes, p.to);
-        } else if (window.shuffle < kNarrowShuffles + kMediumShuffles) {
-            p.to = PutMedium(lanes, p.to);
-        } else {
-            p.to = PutWide(lanes, p.to);
-        }
-        p.from += window.consumed;
-        ends >>= window.consumed;
-    } while (p.from < stop);
-    return p;
-}
 
 // A bit for each byte that is no continuation.
 O_INLINE std::uint64_t StartsIn(__m128i block) { return HighBits(_mm_cmpgt_epi8(block, Bytes(0xBF))); }
 
-// Decodes until `stop` is reached or passed. REQUIRES: 80 bytes may be read, and 64 units written, from any place before
-// `stop`.
-O_SSE41 Position DecodeBlocks(Position p, Byte const *stop) {
-    while (p.from < stop) {
-        __m128i const a = Load(p.from);
-        __m128i const b = Load(p.from + kBlock);
-        __m128i const c = Load(p.from + 2 * kBlock);
-        __m128i const d = Load(p.from + 3 * kBlock);
-        if (HighBits(_mm_or_si128(_mm_or_si128(a, b), _mm_or_si128(c, d))) == 0) {
-            WidenBlock(a, p.to);
-            WidenBlock(b, p.to + kBlock);
-            WidenBlock(c, p.to + 2 * kBlock);
-            WidenBlock(d, p.to + 3 * kBlock);
-            p.from += kWide;
-            p.to += kWide;
-            continue;
-        }
-        std::uint64_t const starts = StartsIn(a) | StartsIn(b) << 16 | StartsIn(c) << 32 | StartsIn(d) << 48;
-        auto const left = static_cast<std::size_t>(stop - p.from);
-        p = DecodeWindows(p, starts >> 1, left < 48 ? left : 48);
-    }
-    return p;
+// A bit for each byte that is as large or larger.
+O_INLINE std::uint64_t AtLeast(__m128i block, unsigned least) {
+    return HighBits(_mm_cmpeq_epi8(_mm_max_epu8(block, Bytes(least)), block));
 }
 
-constexpr std::size_t kReach = 80; // what DecodeBlocks may read
+template <Longest kLongest> O_SSE41_INLINE void DecodeLanes(Position &p, std::uint64_t lanes, std::size_t bytes) {
+    for (std::size_t i = 0; i < bytes; i += 8, lanes >>= 8) {
+        p.to = DecodeEight<kLongest>(p.from + i, lanes, p.to);
+    }
+    p.from += bytes;
+}
+
+// Decodes 16 bytes of any kind.
+O_SSE41_INLINE void DecodeBlock(Position &p) {
+    __m128i const bytes = Load(p.from);
+    std::uint64_t const fours = AtLeast(bytes, 0xF0);
+    std::uint64_t const lanes = StartsIn(bytes) | fours << 1 | p.lowUnit;
+    p.lowUnit = fours >> 15;
+    DecodeLanes<Longest::kFour>(p, lanes, kBlock);
+}
+
+// Decodes 64 bytes; the longest character among them decides how.
+O_SSE41_INLINE void DecodeWide(Position &p) {
+    __m128i const a = Load(p.from);
+    __m128i const b = Load(p.from + kBlock);
+    __m128i const c = Load(p.from + 2 * kBlock);
+    __m128i const d = Load(p.from + 3 * kBlock);
+    __m128i const largest = _mm_max_epu8(_mm_max_epu8(a, b), _mm_max_epu8(c, d));
+    if (HighBits(largest) == 0) {
+        WidenBlock(a, p.to);
+        WidenBlock(b, p.to + kBlock);
+        WidenBlock(c, p.to + 2 * kBlock);
+        WidenBlock(d, p.to + 3 * kBlock);
+        p.from += kWide;
+        p.to += kWide;
+        return;
+    }
+    std::uint64_t const starts = StartsIn(a) | StartsIn(b) << 16 | StartsIn(c) << 32 | StartsIn(d) << 48;
+    if (p.lowUnit != 0 || AtLeast(largest, 0xF0) != 0) {
+        std::uint64_t const fours =
+            AtLeast(a, 0xF0) | AtLeast(b, 0xF0) << 16 | AtLeast(c, 0xF0) << 32 | AtLeast(d, 0xF0) << 48;
+        std::uint64_t const lanes = starts | fours << 1 | p.lowUnit;
+        p.lowUnit = fours >> 63;
+        DecodeLanes<Longest::kFour>(p, lanes, kWide);
+    } else if (AtLeast(largest, 0xE0) != 0) {
+        DecodeLanes<Longest::kThree>(p, starts, kWide);
+    } else {
+        DecodeLanes<Longest::kTwo>(p, starts, kWide);
+    }
+}
+
+// What must be left for decoding 64 bytes in place: the last eight of them are then followed by bytes enough to be read
+// and to give the eight units that a store may write, three bytes for each.
+constexpr std::size_t kReach = 96;
 
 } // namespace
 
@@ -354,21 +299,23 @@ O_SSE41 Utf8Scan ScanUtf8Sse41(Byte const *from, std::size_t size) noexcept {
 O_SSE41 void DecodeValidSse41(Byte const *from, std::size_t size, Unit *to, std::size_t count) noexcept {
     Byte const *const end = from + size;
     Unit *const toEnd = to + count;
-    if (size >= kReach) {
-        // From here on every byte is still followed by enough: 32 bytes left give more than the 8 units of a store.
-        Position const p = DecodeBlocks({from, to}, end - kReach + 1);
-        from = p.from;
-        to = p.to;
+    Position p{from, to, 0};
+    while (static_cast<std::size_t>(end - p.from) >= kReach) {
+        DecodeWide(p);
     }
     // The rest goes through memory that may be read and written past its end.
-    alignas(kBlock) Byte rest[2 * kReach] = {};
-    alignas(kBlock) Unit units[2 * kReach];
-    auto const left = static_cast<std::size_t>(end - from);
-    if (left != 0) {
-        std::memcpy(rest, from, left);
-        DecodeBlocks({rest, units}, rest + left);
-        std::memcpy(to, units, static_cast<std::size_t>(toEnd - to) * sizeof(Unit));
+    auto const left = static_cast<std::size_t>(end - p.from);
+    if (left == 0) {
+        return;
     }
+    alignas(kBlock) Byte rest[kReach + kBlock] = {};
+    alignas(kBlock) Unit units[kReach + 2 * kBlock];
+    std::memcpy(rest, p.from, left);
+    Position r{rest, units, p.lowUnit};
+    while (r.from < rest + left) {
+        DecodeBlock(r);
+    }
+    std::memcpy(p.to, units, static_cast<std::size_t>(toEnd - p.to) * sizeof(Unit));
 }
 
 } // namespace OUtf

@@ -11,37 +11,53 @@ using namespace OUtf;
 
 namespace {
 
+O_INLINE __m128i Words(unsigned value) { return _mm_set1_epi16(static_cast<short>(value)); }
+
+O_INLINE __m128i HaveNone(__m128i units, unsigned bits) {
+    return _mm_cmpeq_epi16(_mm_and_si128(units, Words(bits)), _mm_setzero_si128());
+}
+
+O_INLINE __m128i AreSurrogates(__m128i units, unsigned first) {
+    return _mm_cmpeq_epi16(_mm_and_si128(units, Words(0xFC00)), Words(first));
+}
+
+// Bytes that eight units do not give of the 24 that they could, in lanes as negative numbers. A pair gives four bytes, two
+// less than other units; they are taken off at its first half, so the unit after the eight is looked at.
+O_INLINE __m128i BytesSaved(Unit const *from) {
+    __m128i const units = Load(from);
+    __m128i const saved = _mm_add_epi16(HaveNone(units, 0xFF80), HaveNone(units, 0xF800));
+    __m128i const isHigh = AreSurrogates(units, 0xD800);
+    if (HighBits(isHigh) == 0) {
+        return saved;
+    }
+    __m128i const isPair = _mm_and_si128(isHigh, AreSurrogates(Load(from + 1), 0xDC00));
+    return _mm_add_epi16(saved, _mm_add_epi16(isPair, isPair));
+}
+
+O_INLINE bool AreAscii(Unit const *from) {
+    __m128i const low = _mm_or_si128(Load(from), Load(from + 8));
+    __m128i const high = _mm_or_si128(Load(from + 16), Load(from + 24));
+    return HighBits(HaveNone(_mm_or_si128(low, high), 0xFF80)) == 0xFFFF;
+}
+
 // Bytes that the units give: 1, 2 or 3 each, and 4 instead of 6 for a surrogate pair.
 std::size_t CountBytes(Unit const *from, std::size_t count) {
-    std::size_t bytes = count;
+    constexpr std::size_t kUnits = 32;
+    std::size_t bytes = 0;
     std::size_t i = 0;
-    __m128i const zero = _mm_setzero_si128();
-    __m128i const surrogateBits = _mm_set1_epi16(static_cast<short>(0xFC00));
-    __m128i const high = _mm_set1_epi16(static_cast<short>(0xD800));
-    __m128i const low = _mm_set1_epi16(static_cast<short>(0xDC00));
-    while (count - i > 8) { // one unit past the block is read, for the second half of a pair
-        std::size_t const left = (count - i - 1) / 8;
-        std::size_t blocks =
-            left < 63 ? left : 63; // each block adds at most 2 to each byte of a counter, bias included
-        __m128i extra = zero;
-        __m128i pairs = zero;
-        for (; blocks != 0; --blocks, i += 8) {
-            __m128i const units = Load(from + i);
-            __m128i const next = Load(from + i + 1);
-            __m128i const two = _mm_cmpeq_epi16(_mm_and_si128(units, _mm_set1_epi16(static_cast<short>(0xFF80))), zero);
-            __m128i const three =
-                _mm_cmpeq_epi16(_mm_and_si128(units, _mm_set1_epi16(static_cast<short>(0xF800))), zero);
-            __m128i const pair = _mm_and_si128(_mm_cmpeq_epi16(_mm_and_si128(units, surrogateBits), high),
-                                               _mm_cmpeq_epi16(_mm_and_si128(next, surrogateBits), low));
-            extra = _mm_add_epi16(_mm_add_epi16(extra, _mm_set1_epi16(2)), _mm_add_epi16(two, three));
-            pairs = _mm_sub_epi16(pairs, pair);
+    for (; count - i > kUnits; i += kUnits) {
+        if (AreAscii(from + i)) {
+            bytes += kUnits;
+            continue;
         }
-        bytes += SumBytes(extra);
-        bytes -= 2 * SumBytes(pairs);
+        __m128i const low = _mm_add_epi16(BytesSaved(from + i), BytesSaved(from + i + 8));
+        __m128i const high = _mm_add_epi16(BytesSaved(from + i + 16), BytesSaved(from + i + 24));
+        __m128i const saved = _mm_sub_epi16(_mm_setzero_si128(), _mm_add_epi16(low, high));
+        bytes += 3 * kUnits - SumBytes(saved); // at most 8 in each lane: its upper byte is zero
     }
     for (; i < count; ++i) {
         unsigned const unit = from[i];
-        bytes += static_cast<std::size_t>(unit >= 0x80) + static_cast<std::size_t>(unit >= 0x800);
+        bytes += 1 + static_cast<std::size_t>(unit >= 0x80) + static_cast<std::size_t>(unit >= 0x800);
         if (IsHighSurrogate(unit) && i + 1 < count && IsLowSurrogate(from[i + 1])) {
             bytes -= 2;
         }

@@ -1,10 +1,15 @@
 // OUtfEncodeSse41.cpp: UTF-16 to UTF-8 by byte shuffles.
 //
 // Eight units are encoded together: each gets a lane with its bytes at the end, and a shuffle from a table moves the bytes
-// of all lanes together. Surrogates need no step of their own, as each half of a pair gives two of the four bytes:
+// of all lanes together. No unit but a broken surrogate needs a branch, as each half of a surrogate pair gives two of the
+// four bytes. These are the last two bytes that some other unit of three bytes would give, but for three bits in the
+// first half's, so that pairs take the way of all others:
 //
-//     high   110110 wwwwzzzzyy          gives   11110uuu 10uuzzzz      where uuuuu = wwww + 1
-//     low    110111 YYYYxxxxxx          gives   10yyYYYY 10xxxxxx      yy from the unit before
+//     half                              its bytes             the bytes of
+//     high  110110ww wwzzzzyy           11110uuu 10uuzzzz     0000000u uuuuzzzz, with 01110000 set in the first
+//     low   110111YY YYxxxxxx           10yyYYYY 10xxxxxx     0000yyYY YYxxxxxx, yy from the high half before it
+//
+// where uuuuu = wwww + 1.
 
 #include "OUtfSse41.h"
 
@@ -42,7 +47,7 @@ constexpr auto MakeShortPackings() {
 }
 
 // Four lanes of four bytes, of which the last 1, 2 or 3 count: bits 0 to 3 mark the lanes of one byte, bits 4 to 7 those
-// of three.
+// of less than three.
 constexpr auto MakeLongPackings() {
     std::array<Packing, 256> packings{};
     for (unsigned form = 0; form < packings.size(); ++form) {
@@ -50,7 +55,7 @@ constexpr auto MakeLongPackings() {
         packing.shuffle.fill(0x80);
         for (unsigned lane = 0; lane < 4; ++lane) {
             bool const one = (form >> lane & 1U) != 0;
-            bool const three = (form >> (lane + 4) & 1U) != 0;
+            bool const three = (form >> (lane + 4) & 1U) == 0;
             for (unsigned byte = one ? 3 : three ? 1 : 2; byte < 4; ++byte) {
                 packing.shuffle[packing.size++] = static_cast<Byte>(4 * lane + byte);
             }
@@ -84,54 +89,50 @@ O_SSE41_INLINE Byte *PutShort(__m128i units, Byte *to) {
     return PutPacked(lanes, kShortPackings[ones], to);
 }
 
-// The three bytes of each unit, still in lanes of 16 bits.
+// Eight units on their way to up to three bytes each.
 struct Lanes {
     __m128i units;
-    __m128i first;
-    __m128i second;
-    __m128i third;
-    __m128i isPaired; // half of a surrogate pair: the second and third byte count
+    __m128i isOne;      // gives one byte
+    __m128i isShort;    // gives less than three
+    __m128i secondBits; // to be set in the second of the three bytes
 };
 
-// Gives the halves of surrogate pairs their bytes and makes a replacement of every other surrogate. `before` and `after`
-// hold the neighbours of the units.
-O_SSE41_INLINE Lanes SurrogateLanes(__m128i units, __m128i before, __m128i after) {
-    __m128i const isHigh = _mm_and_si128(AreSurrogates(units, 0xD800), AreSurrogates(after, 0xDC00));
-    __m128i const isLow = _mm_and_si128(AreSurrogates(units, 0xDC00), AreSurrogates(before, 0xD800));
-    __m128i const isSurrogate = _mm_cmpeq_epi16(_mm_and_si128(units, Words(0xF800)), Words(0xD800));
-    __m128i const isPaired = _mm_or_si128(isHigh, isLow);
-
-    __m128i const uzy = _mm_sub_epi16(units, Words(0xD800 - 0x40)); // the 1 added to wwww
-    __m128i const highSecond = _mm_or_si128(_mm_srli_epi16(uzy, 8), Words(0xF0));
-    __m128i const highThird = _mm_or_si128(_mm_and_si128(_mm_srli_epi16(uzy, 2), Words(0x3F)), Words(0x80));
-    __m128i const yy = _mm_slli_epi16(_mm_and_si128(before, Words(0x03)), 4);
-    __m128i const lowSecond =
-        _mm_or_si128(_mm_or_si128(_mm_and_si128(_mm_srli_epi16(units, 6), Words(0x0F)), yy), Words(0x80));
-    __m128i const lowThird = _mm_or_si128(_mm_and_si128(units, Words(0x3F)), Words(0x80));
-
-    return {_mm_blendv_epi8(units, Words(kReplacement), _mm_andnot_si128(isPaired, isSurrogate)), _mm_setzero_si128(),
-            _mm_blendv_epi8(lowSecond, highSecond, isHigh), _mm_blendv_epi8(lowThird, highThird, isHigh), isPaired};
+O_SSE41_INLINE Lanes LanesOf(__m128i units) {
+    __m128i const zero = _mm_setzero_si128();
+    __m128i const isOne = _mm_cmpeq_epi16(_mm_and_si128(units, Words(0xFF80)), zero);
+    __m128i const isShort = _mm_cmpeq_epi16(_mm_and_si128(units, Words(0xF800)), zero);
+    // In two bytes the lead is the second byte of three with one bit more.
+    return {units, isOne, isShort, _mm_and_si128(isShort, Words(0x40))};
 }
 
-// Fills in the lanes of all units but the paired surrogates and packs them. The result may reach 28 bytes past `to`.
-O_SSE41_INLINE Byte *PutLong(Lanes const &l, Byte *to) {
-    __m128i const zero = _mm_setzero_si128();
-    __m128i const isOne = _mm_cmpeq_epi16(_mm_and_si128(l.units, Words(0xFF80)), zero);
-    __m128i const isBelowThree = _mm_cmpeq_epi16(_mm_and_si128(l.units, Words(0xF800)), zero);
-    __m128i const isThree = _mm_andnot_si128(_mm_or_si128(isBelowThree, l.isPaired), _mm_cmpeq_epi16(zero, zero));
+// Turns the halves of surrogate pairs into the units whose bytes they share, and other surrogates into replacements.
+// `before` and `after` hold the neighbours of the units.
+O_SSE41_INLINE void TranslateSurrogates(Lanes &l, __m128i isSurrogate, __m128i before, __m128i after) {
+    __m128i const isHigh = _mm_and_si128(AreSurrogates(l.units, 0xD800), AreSurrogates(after, 0xDC00));
+    __m128i const isLow = _mm_and_si128(AreSurrogates(l.units, 0xDC00), AreSurrogates(before, 0xD800));
+    __m128i const isPaired = _mm_or_si128(isHigh, isLow);
 
+    __m128i const high = _mm_srli_epi16(_mm_sub_epi16(l.units, Words(0xD800 - 0x40)), 2); // 0x40: the 1 added to wwww
+    __m128i const yy = _mm_slli_epi16(_mm_and_si128(before, Words(0x03)), 10);
+    __m128i const low = _mm_or_si128(_mm_and_si128(l.units, Words(0x3FF)), yy);
+    __m128i const lowOrLost = _mm_blendv_epi8(Words(kReplacement), low, isLow);
+    l.units = _mm_blendv_epi8(l.units, _mm_blendv_epi8(lowOrLost, high, isHigh), isSurrogate);
+    l.isShort = _mm_or_si128(l.isShort, isPaired);
+    l.secondBits = _mm_or_si128(l.secondBits, _mm_and_si128(isHigh, Words(0x70)));
+}
+
+// Writes the bytes of eight lanes. Up to 28 bytes from `to` on are overwritten.
+O_SSE41_INLINE Byte *PutLong(Lanes const &l, Byte *to) {
+    __m128i const six = Words(0x3F);
     __m128i const first = _mm_or_si128(_mm_srli_epi16(l.units, 12), Words(0xE0));
-    // In two bytes the lead is the second byte of three with one bit more.
-    __m128i const leadBit = _mm_and_si128(isBelowThree, Words(0x40));
-    __m128i const middle = _mm_and_si128(_mm_srli_epi16(l.units, 6), Words(0x3F));
-    __m128i const second = _mm_or_si128(_mm_or_si128(middle, leadBit), Words(0x80));
-    __m128i const tail = _mm_or_si128(_mm_and_si128(l.units, Words(0x3F)), Words(0x80));
-    __m128i const third = _mm_blendv_epi8(tail, l.units, isOne);
+    __m128i const middle = _mm_or_si128(_mm_and_si128(_mm_srli_epi16(l.units, 6), six), Words(0x80));
+    __m128i const second = _mm_or_si128(middle, l.secondBits);
+    __m128i const tail = _mm_or_si128(_mm_and_si128(l.units, six), Words(0x80));
+    __m128i const third = _mm_blendv_epi8(tail, l.units, l.isOne);
 
     __m128i const lower = _mm_slli_epi16(first, 8);
-    __m128i const upper = _mm_or_si128(_mm_blendv_epi8(second, l.second, l.isPaired),
-                                       _mm_slli_epi16(_mm_blendv_epi8(third, l.third, l.isPaired), 8));
-    unsigned const forms = HighBits(_mm_packs_epi16(isOne, isThree));
+    __m128i const upper = _mm_or_si128(second, _mm_slli_epi16(third, 8));
+    unsigned const forms = HighBits(_mm_packs_epi16(l.isOne, l.isShort));
     to = PutPacked(_mm_unpacklo_epi16(lower, upper), kLongPackings[(forms & 0x0F) | (forms >> 4 & 0xF0)], to);
     return PutPacked(_mm_unpackhi_epi16(lower, upper), kLongPackings[(forms >> 4 & 0x0F) | (forms >> 8 & 0xF0)], to);
 }
@@ -145,17 +146,16 @@ struct Position {
 // Encodes the eight units at `from`; one more is looked at.
 O_SSE41_INLINE void EncodeBlock(Position &p) {
     __m128i const units = Load(p.from);
-    __m128i const zero = _mm_setzero_si128();
-    if (IsZero(_mm_and_si128(units, Words(0xFF80)))) {
-        _mm_storel_epi64(reinterpret_cast<__m128i *>(p.to), _mm_packus_epi16(units, units));
-        p.to += kUnits;
-    } else if (IsZero(_mm_and_si128(units, Words(0xF800)))) {
+    __m128i const upperBits = _mm_and_si128(units, Words(0xF800));
+    if (IsZero(upperBits)) {
         p.to = PutShort(units, p.to);
-    } else if (IsZero(_mm_cmpeq_epi16(_mm_and_si128(units, Words(0xF800)), Words(0xD800)))) {
-        p.to = PutLong({units, zero, zero, zero, zero}, p.to);
     } else {
-        __m128i const before = _mm_alignr_epi8(units, p.previous, 14);
-        p.to = PutLong(SurrogateLanes(units, before, Load(p.from + 1)), p.to);
+        Lanes lanes = LanesOf(units);
+        __m128i const isSurrogate = _mm_cmpeq_epi16(upperBits, Words(0xD800));
+        if (!IsZero(isSurrogate)) {
+            TranslateSurrogates(lanes, isSurrogate, _mm_alignr_epi8(units, p.previous, 14), Load(p.from + 1));
+        }
+        p.to = PutLong(lanes, p.to);
     }
     p.previous = units;
     p.from += kUnits;
