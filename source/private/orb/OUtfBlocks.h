@@ -54,6 +54,12 @@ template <typename String, typename Write> void FillExactly(String &text, std::s
 #endif
 }
 
+// Sixteen ASCII characters to units.
+O_INLINE void WidenBlock(__m128i bytes, Unit *to) {
+    Store(to, _mm_unpacklo_epi8(bytes, _mm_setzero_si128()));
+    Store(to + 8, _mm_unpackhi_epi8(bytes, _mm_setzero_si128()));
+}
+
 // Adds up the 0/1 bytes of at most 255 blocks that were subtracted as 0/-1 masks.
 O_INLINE std::size_t SumBytes(__m128i counts) {
     __m128i const sums = _mm_sad_epu8(counts, _mm_setzero_si128());

@@ -263,6 +263,60 @@ KTUnits DecodeAnything(Byte const *from, Byte const *end) {
     return wellFormed ? units : DecodeWithReplacements(from, end);
 }
 
+// ---- ASCII ----
+
+// A bit for each byte that is ASCII and not zero.
+O_INLINE unsigned PlainBytes(__m128i block) { return HighBits(_mm_cmpgt_epi8(block, _mm_setzero_si128())); }
+
+O_READS_WHOLE_BLOCKS O_INLINE bool ArePlain(__m128i const *four) {
+    __m128i const zero = _mm_setzero_si128();
+    __m128i const low = _mm_and_si128(_mm_cmpgt_epi8(four[0], zero), _mm_cmpgt_epi8(four[1], zero));
+    __m128i const high = _mm_and_si128(_mm_cmpgt_epi8(four[2], zero), _mm_cmpgt_epi8(four[3], zero));
+    return HighBits(_mm_and_si128(low, high)) == 0xFFFF;
+}
+
+// Length of the ASCII text before the first other byte or the terminating zero. Reads aligned blocks from the one that
+// holds the first byte, and four of them at once where they cannot reach into another memory page.
+O_READS_WHOLE_BLOCKS std::size_t PlainLength(char const *text) {
+    constexpr std::uintptr_t kFour = 4 * kBlock;
+    auto const address = reinterpret_cast<std::uintptr_t>(text);
+    auto const *block = reinterpret_cast<__m128i const *>(address & ~static_cast<std::uintptr_t>(kBlock - 1));
+    unsigned const skipped = static_cast<unsigned>(address & (kBlock - 1));
+    unsigned other = ~(PlainBytes(*block) >> skipped) & (0xFFFFU >> skipped);
+    if (other != 0) {
+        return TrailingZeros(other);
+    }
+    do {
+        ++block;
+        if (reinterpret_cast<std::uintptr_t>(block) % kFour == 0) {
+            while (ArePlain(block)) {
+                block += 4;
+            }
+        }
+        other = ~PlainBytes(*block) & 0xFFFFU;
+    } while (other == 0);
+    return reinterpret_cast<std::uintptr_t>(block) - address + TrailingZeros(other);
+}
+
+void WidenPlain(Byte const *from, std::size_t size, Unit *to) {
+    if (size < kBlock) {
+        for (std::size_t i = 0; i < size; ++i) {
+            to[i] = from[i];
+        }
+        return;
+    }
+    std::size_t i = 0;
+    for (; size - i >= 2 * kBlock; i += 2 * kBlock) {
+        WidenBlock(Load(from + i), to + i);
+        WidenBlock(Load(from + i + kBlock), to + i + kBlock);
+    }
+    if (size - i >= kBlock) {
+        WidenBlock(Load(from + i), to + i);
+    }
+    // The last block overlaps what is done.
+    WidenBlock(Load(from + size - kBlock), to + size - kBlock);
+}
+
 } // namespace
 
 KTUnits OUtf8ToUnits(std::string_view bytes) {
@@ -276,4 +330,14 @@ KTUnits OUtf8ToUnits(std::string_view bytes) {
         }
     }
     return DecodeAnything(from, from + bytes.size());
+}
+
+KTUnits OUtf8TextToUnits(char const *text) {
+    std::size_t const plain = PlainLength(text);
+    if (text[plain] != 0) {
+        return OUtf8ToUnits({text, plain + OByteLength(text + plain)});
+    }
+    KTUnits units;
+    FillExactly(units, plain, [&](Unit *to) { WidenPlain(reinterpret_cast<Byte const *>(text), plain, to); });
+    return units;
 }

@@ -117,27 +117,32 @@ O_INLINE __m128i IncompleteAtEnd(__m128i block) {
     return _mm_subs_epu8(block, most);
 }
 
+// Checks 16 bytes and subtracts from the counts one for each byte that is no continuation, and one more for each lead of
+// four.
+O_SSE41_INLINE __m128i ScanBlock(Scanner &s, __m128i block, __m128i counts) {
+    s.errors = _mm_or_si128(s.errors, ErrorsIn(block, s.previous));
+    s.previous = block;
+    __m128i const starts = _mm_cmpgt_epi8(block, Bytes(0xBF));
+    __m128i const fours = _mm_cmpeq_epi8(_mm_max_epu8(block, Bytes(0xF0)), block);
+    return _mm_sub_epi8(_mm_sub_epi8(counts, starts), fours);
+}
+
 // Checks and counts 64 bytes.
 O_SSE41_INLINE void ScanWide(Scanner &s, Byte const *from) {
-    __m128i const blocks[] = {Load(from), Load(from + kBlock), Load(from + 2 * kBlock), Load(from + 3 * kBlock)};
-    __m128i const all = _mm_or_si128(_mm_or_si128(blocks[0], blocks[1]), _mm_or_si128(blocks[2], blocks[3]));
-    if (HighBits(all) == 0) {
+    __m128i const a = Load(from);
+    __m128i const b = Load(from + kBlock);
+    __m128i const c = Load(from + 2 * kBlock);
+    __m128i const d = Load(from + 3 * kBlock);
+    if (HighBits(_mm_or_si128(_mm_or_si128(a, b), _mm_or_si128(c, d))) == 0) {
         s.errors = _mm_or_si128(s.errors, IncompleteAtEnd(s.previous));
+        s.previous = d;
         s.units += kWide;
-    } else {
-        // A unit for each byte that is no continuation, and one more for each lead of four.
-        __m128i counts = _mm_setzero_si128();
-        __m128i previous = s.previous;
-        for (__m128i const block : blocks) {
-            s.errors = _mm_or_si128(s.errors, ErrorsIn(block, previous));
-            __m128i const starts = _mm_cmpgt_epi8(block, Bytes(0xBF));
-            __m128i const fours = _mm_cmpeq_epi8(_mm_max_epu8(block, Bytes(0xF0)), block);
-            counts = _mm_sub_epi8(_mm_sub_epi8(counts, starts), fours);
-            previous = block;
-        }
-        s.units += SumBytes(counts);
+        return;
     }
-    s.previous = blocks[3];
+    __m128i counts = ScanBlock(s, a, _mm_setzero_si128());
+    counts = ScanBlock(s, b, counts);
+    counts = ScanBlock(s, c, counts);
+    s.units += SumBytes(ScanBlock(s, d, counts));
 }
 
 // ---- the conversion ----
@@ -208,11 +213,6 @@ template <Longest kLongest> O_SSE41_INLINE Unit *DecodeEight(Byte const *from, s
     return to + packing.units;
 }
 
-O_INLINE void WidenBlock(__m128i bytes, Unit *to) {
-    Store(to, _mm_unpacklo_epi8(bytes, _mm_setzero_si128()));
-    Store(to + 8, _mm_unpackhi_epi8(bytes, _mm_setzero_si128()));
-}
-
 struct Position {
     Byte const *from;
     Unit *to;
@@ -232,15 +232,6 @@ template <Longest kLongest> O_SSE41_INLINE void DecodeLanes(Position &p, std::ui
         p.to = DecodeEight<kLongest>(p.from + i, lanes, p.to);
     }
     p.from += bytes;
-}
-
-// Decodes 16 bytes of any kind.
-O_SSE41_INLINE void DecodeBlock(Position &p) {
-    __m128i const bytes = Load(p.from);
-    std::uint64_t const fours = AtLeast(bytes, 0xF0);
-    std::uint64_t const lanes = StartsIn(bytes) | fours << 1 | p.lowUnit;
-    p.lowUnit = fours >> 15;
-    DecodeLanes<Longest::kFour>(p, lanes, kBlock);
 }
 
 // Decodes 64 bytes; the longest character among them decides how.
@@ -277,6 +268,36 @@ O_SSE41_INLINE void DecodeWide(Position &p) {
 // and to give the eight units that a store may write, three bytes for each.
 constexpr std::size_t kReach = 96;
 
+// Decodes eight bytes without writing at `toEnd` or behind it, where padding would give units.
+template <Longest kLongest>
+O_SSE41_INLINE Unit *DecodeEightWithin(Byte const *from, std::uint64_t lanes, Unit *to, Unit *toEnd) {
+    if (toEnd - to >= 8) {
+        return DecodeEight<kLongest>(from, lanes, to);
+    }
+    Unit units[8];
+    Unit const *const unitsEnd = DecodeEight<kLongest>(from, lanes, units);
+    for (Unit const *unit = units; unit != unitsEnd && to != toEnd; ++unit) {
+        *to++ = *unit;
+    }
+    return to;
+}
+
+// Decodes 16 bytes of any kind; two more are looked at. Writes nothing from `toEnd` on.
+O_SSE41_INLINE void DecodeBlock(Position &p, Unit *toEnd) {
+    __m128i const bytes = Load(p.from);
+    std::uint64_t const lanes = StartsIn(bytes) | p.lowUnit;
+    if (p.lowUnit == 0 && AtLeast(bytes, 0xE0) == 0) {
+        p.to = DecodeEightWithin<Longest::kTwo>(p.from, lanes, p.to, toEnd);
+        p.to = DecodeEightWithin<Longest::kTwo>(p.from + 8, lanes >> 8, p.to, toEnd);
+    } else {
+        std::uint64_t const fours = AtLeast(bytes, 0xF0);
+        p.lowUnit = fours >> 15;
+        p.to = DecodeEightWithin<Longest::kFour>(p.from, lanes | fours << 1, p.to, toEnd);
+        p.to = DecodeEightWithin<Longest::kFour>(p.from + 8, (lanes | fours << 1) >> 8, p.to, toEnd);
+    }
+    p.from += kBlock;
+}
+
 } // namespace
 
 O_SSE41 Utf8Scan ScanUtf8Sse41(Byte const *from, std::size_t size) noexcept {
@@ -285,15 +306,21 @@ O_SSE41 Utf8Scan ScanUtf8Sse41(Byte const *from, std::size_t size) noexcept {
     for (; static_cast<std::size_t>(end - from) >= kWide; from += kWide) {
         ScanWide(s, from);
     }
-    // At least one zero follows the rest, which turns a character cut short into an error.
-    auto const left = static_cast<std::size_t>(end - from);
-    alignas(kBlock) Byte rest[kWide] = {};
-    if (left != 0) {
-        std::memcpy(rest, from, left);
+    __m128i counts = _mm_setzero_si128();
+    for (; static_cast<std::size_t>(end - from) >= kBlock; from += kBlock) {
+        counts = ScanBlock(s, Load(from), counts);
     }
-    ScanWide(s, rest);
+    auto const left = static_cast<std::size_t>(end - from);
+    if (left != 0) {
+        Byte rest[kBlock] = {}; // the zeros turn a character cut short into an error and count as units
+        std::memcpy(rest, from, left);
+        counts = ScanBlock(s, Load(rest), counts);
+        s.units -= kBlock - left;
+    }
+    s.units += SumBytes(counts);
+    s.errors = _mm_or_si128(s.errors, IncompleteAtEnd(s.previous));
     bool const isWellFormed = _mm_testz_si128(s.errors, s.errors) != 0;
-    return {s.units - (kWide - left), isWellFormed};
+    return {s.units, isWellFormed};
 }
 
 O_SSE41 void DecodeValidSse41(Byte const *from, std::size_t size, Unit *to, std::size_t count) noexcept {
@@ -303,19 +330,20 @@ O_SSE41 void DecodeValidSse41(Byte const *from, std::size_t size, Unit *to, std:
     while (static_cast<std::size_t>(end - p.from) >= kReach) {
         DecodeWide(p);
     }
-    // The rest goes through memory that may be read and written past its end.
+    while (end - p.from >= static_cast<std::ptrdiff_t>(kBlock + 2)) {
+        DecodeBlock(p, toEnd);
+    }
+    // The rest goes through memory that may be read past its end.
     auto const left = static_cast<std::size_t>(end - p.from);
-    if (left == 0) {
-        return;
+    Byte rest[2 * kBlock + 2] = {};
+    if (left != 0) {
+        std::memcpy(rest, p.from, left);
+        p.from = rest;
+        DecodeBlock(p, toEnd);
     }
-    alignas(kBlock) Byte rest[kReach + kBlock] = {};
-    alignas(kBlock) Unit units[kReach + 2 * kBlock];
-    std::memcpy(rest, p.from, left);
-    Position r{rest, units, p.lowUnit};
-    while (r.from < rest + left) {
-        DecodeBlock(r);
+    if (left > kBlock) {
+        DecodeBlock(p, toEnd);
     }
-    std::memcpy(p.to, units, static_cast<std::size_t>(toEnd - p.to) * sizeof(Unit));
 }
 
 } // namespace OUtf

@@ -55,6 +55,12 @@ std::size_t CountBytes(Unit const *from, std::size_t count) {
         __m128i const saved = _mm_sub_epi16(_mm_setzero_si128(), _mm_add_epi16(low, high));
         bytes += 3 * kUnits - SumBytes(saved); // at most 8 in each lane: its upper byte is zero
     }
+    __m128i saved = _mm_setzero_si128();
+    for (; count - i > 8; i += 8) {
+        saved = _mm_sub_epi16(saved, BytesSaved(from + i));
+        bytes += 24;
+    }
+    bytes -= SumBytes(saved);
     for (; i < count; ++i) {
         unsigned const unit = from[i];
         bytes += 1 + static_cast<std::size_t>(unit >= 0x80) + static_cast<std::size_t>(unit >= 0x800);

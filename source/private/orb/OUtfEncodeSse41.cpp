@@ -121,7 +121,10 @@ O_SSE41_INLINE void TranslateSurrogates(Lanes &l, __m128i isSurrogate, __m128i b
     l.secondBits = _mm_or_si128(l.secondBits, _mm_and_si128(isHigh, Words(0x70)));
 }
 
-// Writes the bytes of eight lanes. Up to 28 bytes from `to` on are overwritten.
+// How many bytes eight units may overwrite: twelve of the first four and a whole block for the others.
+constexpr std::ptrdiff_t kWritten = 12 + kBlock;
+
+// Writes the bytes of eight lanes.
 O_SSE41_INLINE Byte *PutLong(Lanes const &l, Byte *to) {
     __m128i const six = Words(0x3F);
     __m128i const first = _mm_or_si128(_mm_srli_epi16(l.units, 12), Words(0xE0));
@@ -180,8 +183,36 @@ O_SSE41_INLINE bool PackAscii(Position &p) {
     return true;
 }
 
-// What must be left for encoding in place: PutLong's 28 bytes are there then, as each unit gives a byte at least.
-constexpr std::size_t kReach = 33;
+O_SSE41_INLINE bool PackEightAscii(Position &p) {
+    __m128i const units = Load(p.from);
+    if (!IsZero(_mm_and_si128(units, Words(0xFF80)))) {
+        return false;
+    }
+    _mm_storel_epi64(reinterpret_cast<__m128i *>(p.to), _mm_packus_epi16(units, units));
+    p.previous = units;
+    p.from += kUnits;
+    p.to += kUnits;
+    return true;
+}
+
+// Encodes up to eight units through memory that may be read and written past its end.
+O_SSE41_INLINE void EncodeLast(Position &p, std::size_t left) {
+    std::size_t const count = left < kUnits ? left : kUnits;
+    Unit units[2 * kUnits] = {};
+    Byte bytes[kWritten];
+    for (std::size_t i = 0; i <= kUnits && i < left; ++i) {
+        units[i] = p.from[i];
+    }
+    Position r{units, bytes, p.previous};
+    EncodeBlock(r);
+    std::size_t const size = static_cast<std::size_t>(r.to - bytes) - (kUnits - count); // a byte for each zero
+    for (std::size_t i = 0; i < size; ++i) {
+        p.to[i] = bytes[i];
+    }
+    p.previous = r.previous;
+    p.from += count;
+    p.to += size;
+}
 
 } // namespace
 
@@ -189,24 +220,22 @@ O_SSE41 void EncodeSse41(Unit const *from, std::size_t count, Byte *to, std::siz
     Unit const *const end = from + count;
     Byte *const toEnd = to + size;
     Position p{from, to, _mm_setzero_si128()};
-    while (static_cast<std::size_t>(end - p.from) >= kReach) {
-        if (!PackAscii(p)) {
-            EncodeBlock(p);
+    for (;;) {
+        auto const left = static_cast<std::size_t>(end - p.from);
+        if (left >= kAsciiUnits && PackAscii(p)) {
+            continue;
+        }
+        if (left <= kUnits || toEnd - p.to < kWritten) {
+            break;
+        }
+        EncodeBlock(p);
+    }
+    while (p.from != end) {
+        auto const left = static_cast<std::size_t>(end - p.from);
+        if (left < kUnits || !PackEightAscii(p)) {
+            EncodeLast(p, left);
         }
     }
-    // The rest goes through memory that may be read and written past its end.
-    auto const left = static_cast<std::size_t>(end - p.from);
-    if (left == 0) {
-        return;
-    }
-    alignas(kBlock) Unit rest[kReach + 2 * kUnits] = {};
-    alignas(kBlock) Byte bytes[4 * kReach + 2 * kBlock];
-    std::memcpy(rest, p.from, left * sizeof(Unit));
-    Position r{rest, bytes, p.previous};
-    while (r.from < rest + left) {
-        EncodeBlock(r);
-    }
-    std::memcpy(p.to, bytes, static_cast<std::size_t>(toEnd - p.to));
 }
 
 } // namespace OUtf
