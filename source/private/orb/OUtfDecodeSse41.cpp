@@ -147,29 +147,24 @@ O_SSE41_INLINE void ScanWide(Scanner &s, Byte const *from) {
 
 // ---- the conversion ----
 
-// How to move the lanes of eight bytes together whose bits are set.
-struct Packing {
-    Shuffle shuffle;
-    Byte units;
-};
-
-constexpr auto MakePackings() {
-    std::array<Packing, 256> packings{};
-    for (unsigned lanes = 0; lanes < packings.size(); ++lanes) {
-        Packing &packing = packings[lanes];
-        packing.shuffle.fill(0x80); // gives a zero byte
+// A bit for each of eight lanes that gives a unit. What lies behind the units does not matter.
+constexpr Packings MakePackings() {
+    Packings packings{};
+    for (unsigned lanes = 0; lanes < 256; ++lanes) {
+        Byte *const shuffle = packings.shuffles[lanes];
+        Byte &size = packings.sizes[lanes];
         for (unsigned lane = 0; lane < 8; ++lane) {
             if ((lanes >> lane & 1U) != 0) {
-                packing.shuffle[2U * packing.units] = static_cast<Byte>(2 * lane);
-                packing.shuffle[2U * packing.units + 1] = static_cast<Byte>(2 * lane + 1);
-                ++packing.units;
+                shuffle[2U * size] = static_cast<Byte>(2 * lane);
+                shuffle[2U * size + 1] = static_cast<Byte>(2 * lane + 1);
+                ++size;
             }
         }
     }
     return packings;
 }
 
-constexpr auto kPackings = MakePackings();
+constexpr Packings kPackings = MakePackings();
 
 O_SSE41_INLINE __m128i LanesAt(Byte const *from) {
     return _mm_cvtepu8_epi16(_mm_loadl_epi64(reinterpret_cast<__m128i const *>(from)));
@@ -208,9 +203,9 @@ template <Longest kLongest> O_SSE41_INLINE __m128i UnitsAt(Byte const *from) {
 
 // Decodes the lanes of eight bytes that are set in the low bits of `lanes`. Writes eight units, whatever their number.
 template <Longest kLongest> O_SSE41_INLINE Unit *DecodeEight(Byte const *from, std::uint64_t lanes, Unit *to) {
-    Packing const &packing = kPackings[lanes & 0xFF];
-    Store(to, _mm_shuffle_epi8(UnitsAt<kLongest>(from), LoadTable(packing.shuffle)));
-    return to + packing.units;
+    std::size_t const form = lanes & 0xFF;
+    Store(to, _mm_shuffle_epi8(UnitsAt<kLongest>(from), Load(kPackings.shuffles[form])));
+    return to + kPackings.sizes[form];
 }
 
 struct Position {
@@ -289,6 +284,9 @@ O_SSE41_INLINE void DecodeBlock(Position &p, Unit *toEnd) {
     if (p.lowUnit == 0 && AtLeast(bytes, 0xE0) == 0) {
         p.to = DecodeEightWithin<Longest::kTwo>(p.from, lanes, p.to, toEnd);
         p.to = DecodeEightWithin<Longest::kTwo>(p.from + 8, lanes >> 8, p.to, toEnd);
+    } else if (p.lowUnit == 0 && AtLeast(bytes, 0xF0) == 0) {
+        p.to = DecodeEightWithin<Longest::kThree>(p.from, lanes, p.to, toEnd);
+        p.to = DecodeEightWithin<Longest::kThree>(p.from + 8, lanes >> 8, p.to, toEnd);
     } else {
         std::uint64_t const fours = AtLeast(bytes, 0xF0);
         p.lowUnit = fours >> 15;

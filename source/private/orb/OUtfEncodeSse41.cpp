@@ -13,7 +13,6 @@
 
 #include "OUtfSse41.h"
 
-#include <array>
 #include <smmintrin.h>
 
 namespace OUtf {
@@ -24,22 +23,16 @@ constexpr std::size_t kUnits = 8; // in a block
 
 O_INLINE __m128i Words(unsigned value) { return _mm_set1_epi16(static_cast<short>(value)); }
 
-// How to move the bytes of a block's lanes together.
-struct Packing {
-    std::array<Byte, kBlock> shuffle;
-    Byte size; // bytes that the lanes give
-};
-
 // Eight lanes of two bytes; a set bit means that only the first one counts.
-constexpr auto MakeShortPackings() {
-    std::array<Packing, 256> packings{};
-    for (unsigned ones = 0; ones < packings.size(); ++ones) {
-        Packing &packing = packings[ones];
-        packing.shuffle.fill(0x80);
+constexpr Packings MakeShortPackings() {
+    Packings packings{};
+    for (unsigned ones = 0; ones < 256; ++ones) {
+        Byte *const shuffle = packings.shuffles[ones];
+        Byte &size = packings.sizes[ones];
         for (unsigned lane = 0; lane < 8; ++lane) {
-            packing.shuffle[packing.size++] = static_cast<Byte>(2 * lane);
+            shuffle[size++] = static_cast<Byte>(2 * lane);
             if ((ones >> lane & 1U) == 0) {
-                packing.shuffle[packing.size++] = static_cast<Byte>(2 * lane + 1);
+                shuffle[size++] = static_cast<Byte>(2 * lane + 1);
             }
         }
     }
@@ -48,28 +41,28 @@ constexpr auto MakeShortPackings() {
 
 // Four lanes of four bytes, of which the last 1, 2 or 3 count: bits 0 to 3 mark the lanes of one byte, bits 4 to 7 those
 // of less than three.
-constexpr auto MakeLongPackings() {
-    std::array<Packing, 256> packings{};
-    for (unsigned form = 0; form < packings.size(); ++form) {
-        Packing &packing = packings[form];
-        packing.shuffle.fill(0x80);
+constexpr Packings MakeLongPackings() {
+    Packings packings{};
+    for (unsigned form = 0; form < 256; ++form) {
+        Byte *const shuffle = packings.shuffles[form];
+        Byte &size = packings.sizes[form];
         for (unsigned lane = 0; lane < 4; ++lane) {
             bool const one = (form >> lane & 1U) != 0;
-            bool const three = (form >> (lane + 4) & 1U) == 0;
-            for (unsigned byte = one ? 3 : three ? 1 : 2; byte < 4; ++byte) {
-                packing.shuffle[packing.size++] = static_cast<Byte>(4 * lane + byte);
+            bool const isShort = (form >> (lane + 4) & 1U) != 0;
+            for (unsigned byte = one ? 3 : isShort ? 2 : 1; byte < 4; ++byte) {
+                shuffle[size++] = static_cast<Byte>(4 * lane + byte);
             }
         }
     }
     return packings;
 }
 
-constexpr auto kShortPackings = MakeShortPackings();
-constexpr auto kLongPackings = MakeLongPackings();
+constexpr Packings kShortPackings = MakeShortPackings();
+constexpr Packings kLongPackings = MakeLongPackings();
 
-O_SSE41_INLINE Byte *PutPacked(__m128i lanes, Packing const &packing, Byte *to) {
-    Store(to, _mm_shuffle_epi8(lanes, Load(packing.shuffle.data())));
-    return to + packing.size;
+O_SSE41_INLINE Byte *PutPacked(__m128i lanes, Packings const &packings, std::size_t form, Byte *to) {
+    Store(to, _mm_shuffle_epi8(lanes, Load(packings.shuffles[form])));
+    return to + packings.sizes[form];
 }
 
 O_INLINE __m128i AreSurrogates(__m128i units, unsigned first) {
@@ -86,7 +79,7 @@ O_SSE41_INLINE Byte *PutShort(__m128i units, Byte *to) {
     __m128i const two = _mm_or_si128(_mm_or_si128(lead, tail), Words(0x80C0));
     __m128i const lanes = _mm_blendv_epi8(two, units, isOne);
     unsigned const ones = HighBits(_mm_packs_epi16(isOne, _mm_setzero_si128()));
-    return PutPacked(lanes, kShortPackings[ones], to);
+    return PutPacked(lanes, kShortPackings, ones, to);
 }
 
 // Eight units on their way to up to three bytes each.
@@ -136,8 +129,10 @@ O_SSE41_INLINE Byte *PutLong(Lanes const &l, Byte *to) {
     __m128i const lower = _mm_slli_epi16(first, 8);
     __m128i const upper = _mm_or_si128(second, _mm_slli_epi16(third, 8));
     unsigned const forms = HighBits(_mm_packs_epi16(l.isOne, l.isShort));
-    to = PutPacked(_mm_unpacklo_epi16(lower, upper), kLongPackings[(forms & 0x0F) | (forms >> 4 & 0xF0)], to);
-    return PutPacked(_mm_unpackhi_epi16(lower, upper), kLongPackings[(forms >> 4 & 0x0F) | (forms >> 8 & 0xF0)], to);
+    std::size_t const lowForm = (forms & 0x0F) | (forms >> 4 & 0xF0);
+    std::size_t const highForm = (forms >> 4 & 0x0F) | (forms >> 8 & 0xF0);
+    to = PutPacked(_mm_unpacklo_epi16(lower, upper), kLongPackings, lowForm, to);
+    return PutPacked(_mm_unpackhi_epi16(lower, upper), kLongPackings, highForm, to);
 }
 
 struct Position {

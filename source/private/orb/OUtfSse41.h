@@ -28,6 +28,13 @@ inline bool HasSse41() noexcept {
 #endif
 }
 
+/// How to move the parts of lanes that count to the front, by the lanes' form in eight bits. Two arrays, as shuffles of a
+/// whole block each are found and loaded faster.
+struct Packings {
+    alignas(kBlock) Byte shuffles[256][kBlock];
+    Byte sizes[256]; ///< how many parts count
+};
+
 struct Utf8Scan {
     std::size_t units; ///< what the text decodes to, if it is well-formed
     bool isWellFormed;
