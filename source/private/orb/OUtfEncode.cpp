@@ -56,10 +56,24 @@ O_INLINE std::size_t CountTogether(Unit const *from) {
     return (isShort ? 2 : 3) * kCounted - saved;
 }
 
+O_INLINE __m128i Merge32(Unit const *from) {
+    return _mm_or_si128(_mm_or_si128(Load(from), Load(from + 8)), _mm_or_si128(Load(from + 16), Load(from + 24)));
+}
+
+// Number of ASCII units at the front, in steps of 64.
+std::size_t CountPlain(Unit const *from, std::size_t count) {
+    std::size_t i = 0;
+    while (count - i >= 64 &&
+           HighBits(HaveNone(_mm_or_si128(Merge32(from + i), Merge32(from + i + 32)), 0xFF80)) == 0xFFFF) {
+        i += 64;
+    }
+    return i;
+}
+
 // Bytes that the units give: 1, 2 or 3 each, and 4 instead of 6 for a surrogate pair.
 std::size_t CountBytes(Unit const *from, std::size_t count) {
-    std::size_t bytes = 0;
-    std::size_t i = 0;
+    std::size_t i = CountPlain(from, count);
+    std::size_t bytes = i;
     for (; count - i > kCounted; i += kCounted) {
         bytes += CountTogether(from + i);
     }

@@ -161,21 +161,27 @@ O_SSE41_INLINE void EncodeBlock(Position &p) {
 
 constexpr std::size_t kAsciiUnits = 32; // packed together
 
-O_SSE41_INLINE bool PackAscii(Position &p) {
-    __m128i const a = Load(p.from);
-    __m128i const b = Load(p.from + 8);
-    __m128i const c = Load(p.from + 16);
-    __m128i const d = Load(p.from + 24);
-    __m128i const all = _mm_or_si128(_mm_or_si128(a, b), _mm_or_si128(c, d));
-    if (!IsZero(_mm_and_si128(all, Words(0xFF80)))) {
-        return false;
+// Packs ASCII, 32 units at a time, until another unit comes or less is left.
+O_SSE41_INLINE void PackAscii(Position &p, Unit const *end) {
+    Unit const *from = p.from;
+    Byte *to = p.to;
+    while (static_cast<std::size_t>(end - from) >= kAsciiUnits) {
+        __m128i const a = Load(from);
+        __m128i const b = Load(from + 8);
+        __m128i const c = Load(from + 16);
+        __m128i const d = Load(from + 24);
+        __m128i const all = _mm_or_si128(_mm_or_si128(a, b), _mm_or_si128(c, d));
+        if (!IsZero(_mm_and_si128(all, Words(0xFF80)))) {
+            break;
+        }
+        Store(to, _mm_packus_epi16(a, b));
+        Store(to + kBlock, _mm_packus_epi16(c, d));
+        from += kAsciiUnits;
+        to += kAsciiUnits;
     }
-    Store(p.to, _mm_packus_epi16(a, b));
-    Store(p.to + kBlock, _mm_packus_epi16(c, d));
-    p.previous = d;
-    p.from += kAsciiUnits;
-    p.to += kAsciiUnits;
-    return true;
+    if (from != p.from) {
+        p = {from, to, Load(from - kUnits)};
+    }
 }
 
 O_SSE41_INLINE bool PackEightAscii(Position &p) {
@@ -216,11 +222,8 @@ O_SSE41 void EncodeSse41(Unit const *from, std::size_t count, Byte *to, std::siz
     Byte *const toEnd = to + size;
     Position p{from, to, _mm_setzero_si128()};
     for (;;) {
-        auto const left = static_cast<std::size_t>(end - p.from);
-        if (left >= kAsciiUnits && PackAscii(p)) {
-            continue;
-        }
-        if (left <= kUnits || toEnd - p.to < kWritten) {
+        PackAscii(p, end);
+        if (end - p.from <= static_cast<std::ptrdiff_t>(kUnits) || toEnd - p.to < kWritten) {
             break;
         }
         EncodeBlock(p);
