@@ -1,5 +1,5 @@
-// OUtf.cpp: lengths of zero-terminated text, and the conversions that are no more than a copy. UTF-8 is in OUtfDecode.cpp
-// and OUtfEncode.cpp.
+// OUtf.cpp: lengths of zero-terminated text, and the conversions that are no more than a copy. UTF-8 is in
+// OUtfDecode.cpp and OUtfEncode.cpp.
 
 #include "OUtf.h"
 

@@ -1,8 +1,8 @@
 // OUtfDecode.cpp: UTF-8 to UTF-16, fast where text is plain and exact where it is broken.
 //
-// Decoding takes two passes over memory that mostly stays in the cache: count the units that the bytes will give, decode
-// into storage of exactly that size. Counting assumes well-formed text; the decoder stops at the first ill-formed byte,
-// and only then a slow pass counts again with replacements and decodes the rest.
+// Decoding takes two passes over memory that mostly stays in the cache: count the units that the bytes will give,
+// decode into storage of exactly that size. Counting assumes well-formed text; the decoder stops at the first
+// ill-formed byte, and only then a slow pass counts again with replacements and decodes the rest.
 //
 //     code points          UTF-8 bytes                          UTF-16 units
 //     U+0000..U+007F       0xxxxxxx                             1

@@ -2,12 +2,12 @@
 //
 // The first pass checks and counts 64 bytes at a time. The check follows Keiser and Lemire, "Validating UTF-8 in less
 // than one instruction per byte": every error of UTF-8 shows in the first byte's two halves and the second byte's upper
-// half, so three table look-ups whose results are and-ed find them, and a comparison with the bytes two and three places
-// back finds the rest.
+// half, so three table look-ups whose results are and-ed find them, and a comparison with the bytes two and three
+// places back finds the rest.
 //
-// The second pass needs no checks. Every byte gets a lane of 16 bits in which its unit is computed as if a character began
-// there; a shuffle from a table then moves the lanes together that really give a unit. Characters of four bytes, which
-// give two, have their first unit in the lane of the first byte and their second in that of the second:
+// The second pass needs no checks. Every byte gets a lane of 16 bits in which its unit is computed as if a character
+// began there; a shuffle from a table then moves the lanes together that really give a unit. Characters of four
+// bytes, which give two, have their first unit in the lane of the first byte and their second in that of the second:
 //
 //     byte at the lane    the unit, from it and the two bytes after it (b, c)
 //     0xxxxxxx            00000000 0xxxxxxx
@@ -33,7 +33,6 @@ using Shuffle = std::array<Byte, kBlock>;
 
 O_INLINE __m128i Bytes(unsigned value) { return _mm_set1_epi8(static_cast<char>(value)); }
 O_INLINE __m128i Words(unsigned value) { return _mm_set1_epi16(static_cast<short>(value)); }
-O_INLINE __m128i Longs(unsigned value) { return _mm_set1_epi32(static_cast<int>(value)); }
 O_INLINE __m128i LoadTable(Shuffle const &shuffle) { return Load(shuffle.data()); }
 
 // ---- the check ----
@@ -117,8 +116,8 @@ O_INLINE __m128i IncompleteAtEnd(__m128i block) {
     return _mm_subs_epu8(block, most);
 }
 
-// Checks 16 bytes and subtracts from the counts one for each byte that is no continuation, and one more for each lead of
-// four.
+// Checks 16 bytes and subtracts from the counts one for each byte that is no continuation, and one more for each lead
+// of four.
 O_SSE41_INLINE __m128i ScanBlock(Scanner &s, __m128i block, __m128i counts) {
     s.errors = _mm_or_si128(s.errors, ErrorsIn(block, s.previous));
     s.previous = block;

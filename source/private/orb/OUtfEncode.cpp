@@ -21,8 +21,8 @@ O_INLINE __m128i AreSurrogates(__m128i units, unsigned first) {
     return _mm_cmpeq_epi16(_mm_and_si128(units, Words(0xFC00)), Words(first));
 }
 
-// Bytes that eight units do not give of the 24 that they could, in lanes as negative numbers. A pair gives four bytes, two
-// less than other units; they are taken off at its first half, so the unit after the eight is looked at.
+// Bytes that eight units do not give of the 24 that they could, in lanes as negative numbers. A pair gives four
+// bytes, two less than other units; they are taken off at its first half, so the unit after the eight is looked at.
 O_INLINE __m128i BytesSaved(Unit const *from) {
     __m128i const units = Load(from);
     __m128i const saved = _mm_add_epi16(HaveNone(units, 0xFF80), HaveNone(units, 0xF800));

@@ -1,9 +1,9 @@
 // OUtfEncodeSse41.cpp: UTF-16 to UTF-8 by byte shuffles.
 //
-// Eight units are encoded together: each gets a lane with its bytes at the end, and a shuffle from a table moves the bytes
-// of all lanes together. No unit but a broken surrogate needs a branch, as each half of a surrogate pair gives two of the
-// four bytes. These are the last two bytes that some other unit of three bytes would give, but for three bits in the
-// first half's, so that pairs take the way of all others:
+// Eight units are encoded together: each gets a lane with its bytes at the end, and a shuffle from a table moves the
+// bytes of all lanes together. No unit but a broken surrogate needs a branch, as each half of a surrogate pair gives
+// two of the four bytes. These are the last two bytes that some other unit of three bytes would give, but for three
+// bits in the first half's, so that pairs take the way of all others:
 //
 //     half                              its bytes             the bytes of
 //     high  110110ww wwzzzzyy           11110uuu 10uuzzzz     0000000u uuuuzzzz, with 01110000 set in the first
@@ -39,8 +39,8 @@ constexpr Packings MakeShortPackings() {
     return packings;
 }
 
-// Four lanes of four bytes, of which the last 1, 2 or 3 count: bits 0 to 3 mark the lanes of one byte, bits 4 to 7 those
-// of less than three.
+// Four lanes of four bytes, of which the last 1, 2 or 3 count: bits 0 to 3 mark the lanes of one byte, bits 4 to 7
+// those of less than three.
 constexpr Packings MakeLongPackings() {
     Packings packings{};
     for (unsigned form = 0; form < 256; ++form) {

@@ -1,5 +1,5 @@
-// OUtfSse41.h: the conversions on processors with SSE4.1, whose byte shuffle handles characters of mixed lengths without
-// a branch for each. Call these only where HasSse41().
+// OUtfSse41.h: the conversions on processors with SSE4.1, whose byte shuffle handles characters of mixed lengths
+// without a branch for each. Call these only where HasSse41().
 
 #pragma once
 
@@ -28,8 +28,8 @@ inline bool HasSse41() noexcept {
 #endif
 }
 
-/// How to move the parts of lanes that count to the front, by the lanes' form in eight bits. Two arrays, as shuffles of a
-/// whole block each are found and loaded faster.
+/// How to move the parts of lanes that count to the front, by the lanes' form in eight bits. Two arrays, as shuffles
+/// of a whole block each are found and loaded faster.
 struct Packings {
     alignas(kBlock) Byte shuffles[256][kBlock];
     Byte sizes[256]; ///< how many parts count
