@@ -11,6 +11,8 @@
 
 #include <benchmark/benchmark.h>
 
+#include <cstddef>
+#include <memory>
 #include <string>
 #include <utility>
 
@@ -36,6 +38,21 @@ benchmark::internal::Benchmark *Add(Task const &task, std::string const &contend
     std::string const name = task.group + '/' + task.kase + '/' + task.size + '/' + contender;
     return benchmark::RegisterBenchmark(name.c_str(), std::move(body))->UseRealTime();
 }
+
+/// While it lives, the heap has a free block of this size that is mapped and not its last one. A heap hands its last
+/// pages back to the system when they are freed, and then a benchmark with results of some 100 KiB would, by the
+/// accident of what was allocated before it, measure the mapping of pages.
+class HeapRoom {
+  public:
+    explicit HeapRoom(std::size_t size) {
+        auto const room = std::make_unique<char[]>(size);
+        m_Behind = std::make_unique<char[]>(size);
+        benchmark::DoNotOptimize(room.get());
+    }
+
+  private:
+    std::unique_ptr<char[]> m_Behind;
+};
 
 /// Says what a group is, for the report's heading. Groups are reported in the order of these calls.
 void DescribeGroup(std::string group, std::string text);

@@ -1,7 +1,7 @@
 // BenchLogger.cpp: log lines on their way to a file that is flushed after every line, one thread and four.
 //
-// The peer's pattern writes milliseconds, a colon and the message, as the library does, so both write lines of about the
-// same length. Four threads share one logger; the time is that of a line, whichever thread wrote it.
+// The peer's pattern writes milliseconds, a colon and the message, as the library does, so both write lines of about
+// the same length. Four threads share one logger; the time is that of a line, whichever thread wrote it.
 
 #include "Bench.h"
 

@@ -1,7 +1,7 @@
 // BenchMain.cpp: ktbench [--page=FILE] [Google Benchmark's options]
 //
 // Prints the ratios as text; with --page they are written as an HTML page as well. The defaults, which options on the
-// command line override, give medians of seven interleaved repetitions.
+// command line override, give medians of nine interleaved repetitions.
 
 #include "Bench.h"
 #include "BenchReport.h"
@@ -18,7 +18,7 @@ constexpr std::string_view kPageOption = "--page=";
 
 // The arguments with our defaults before them, so that later ones win, and without --page, whose value goes to `page`.
 std::vector<std::string> TakeArguments(int argc, char **argv, std::string &page) {
-    std::vector<std::string> arguments{argv[0], "--benchmark_repetitions=7", "--benchmark_min_time=0.02",
+    std::vector<std::string> arguments{argv[0], "--benchmark_repetitions=9", "--benchmark_min_time=0.04",
                                        "--benchmark_enable_random_interleaving=true"};
     for (int i = 1; i < argc; ++i) {
         std::string_view const argument = argv[i];

@@ -1,7 +1,7 @@
 // BenchPage.cpp: the report as one HTML page: a table for each group and, beside it, bars.
 //
-// In a bar chart of peers each bar is a contender's speed where the library's own is 1, so the library's bars end at the
-// line. In a growth chart each bar is a cost on a logarithmic scale from 1 to 10 000.
+// In a bar chart of peers each bar is a contender's speed where the library's own is 1, so the library's bars end at
+// the line. In a growth chart each bar is a cost on a logarithmic scale from 1 to 10 000.
 
 #include "Bench.h"
 #include "BenchReport.h"

@@ -1,8 +1,8 @@
 // BenchReport.h: from measured times to ratios.
 //
-// Google Benchmark measures every contender several times, in random order; the report keeps the median of each. A ratio
-// is the library's speed divided by the peer's in the same run, so 2 means twice as fast. Times themselves are not
-// shown: they belong to the machine, the ratios to the code.
+// Google Benchmark measures every contender several times, in random order; the report keeps the median of each. A
+// ratio is the library's speed divided by the peer's in the same run, so 2 means twice as fast. Times themselves are
+// not shown: they belong to the machine, the ratios to the code.
 
 #pragma once
 

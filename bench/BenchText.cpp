@@ -1,9 +1,10 @@
 // BenchText.cpp: UTF-8 to KTString and back, beside the system's calls and two libraries, each used the way its
 // documentation shows: the result is a fresh string every time.
 //
-// memcpy stands beside ASCII text of 64 KiB twice. "memcpy" moves as many bytes as the conversion, read and written ones
-// counted: UTF-8 of 64 KiB becomes 128 KiB of units, 192 KiB in all, and so does a copy of 96 KiB. "memcpy-source" copies
-// the conversion's source alone. Both copy between strings that are there already, while the conversion makes its own.
+// memcpy stands beside ASCII text of 64 KiB twice. "memcpy" moves as many bytes as the conversion, read and written
+// ones counted: UTF-8 of 64 KiB becomes 128 KiB of units, 192 KiB in all, and so does a copy of 96 KiB.
+// "memcpy-source" copies the conversion's source alone. Both copy between strings that are there already, while the
+// conversion makes its own.
 
 #include "Bench.h"
 #include "BenchSamples.h"
@@ -26,6 +27,9 @@ constexpr char kEncode[] = "utf8-encode";
 constexpr char kSystem[] = "system";
 constexpr char kUtfcpp[] = "utfcpp";
 constexpr char kNowide[] = "nowide";
+
+// Room for a result of two bytes for each byte, or for strings that double while they grow.
+constexpr std::size_t kRoom = 6;
 
 struct Size {
     char const *name;
@@ -66,6 +70,7 @@ std::string UtfcppNarrow(std::u16string const &text) {
 template <typename Input, typename Convert>
 void AddConversion(Task const &task, char const *contender, Input const &input, std::size_t bytes, Convert convert) {
     Add(task, contender, [input, bytes, convert](benchmark::State &state) mutable {
+        HeapRoom const room(kRoom * bytes);
         for (auto _ : state) {
             auto result = convert(input);
             benchmark::DoNotOptimize(result.data());

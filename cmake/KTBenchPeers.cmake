@@ -1,5 +1,5 @@
-# kt_bench_peers: what the benchmarks measure the library against, and Google Benchmark itself. None of it is ever linked
-# into the library.
+# kt_bench_peers: what the benchmarks measure the library against, and Google Benchmark itself. None of it is ever
+# linked into the library.
 #
 # Debian packages the peers as headers. The cross compiler sees just their folders, through links, as the rest of
 # /usr/include belongs to Linux. Google Benchmark is compiled from the sources of Debian's own package (`./kt` fetches
