@@ -23,7 +23,8 @@ usage: ./kt COMMAND
   test [CTEST-ARGS]     every test; the arguments go to ctest, for example -L strings
   build                 build/windows/bin/ and build/windows/lib/
   run PROGRAM [ARGS]    any Windows program, with the library on its path; its exit status is passed through
-  bench [FILTER]        the benchmarks beside their peers; the page is build/bench/index.html
+  bench [FILTER [ARGS]] the benchmarks beside their peers; the page is build/bench/index.html; the arguments go to
+                        Google Benchmark
   sanitize              the portable half natively under ASan and UBSan, then under TSan
   fuzz SECONDS          every fuzz target for that long
   lint                  clang-format and clang-tidy over all sources
@@ -202,10 +203,14 @@ command_bench() {
     need_packages "${bench_packages[@]}"
     need_source benchmark cmake include src CMakeLists.txt
     configure windows -DKT_BUILD_BENCH=ON
-    compile windows
-    mkdir -p "$root/build/bench"
-    (cd "$root/build/bench" && "$root/cmake/wine-run" "$root/build/windows/bin/ktbench.exe" \
-        --page=index.html ${1:+--benchmark_filter="$1"})
+    compile windows ktbench ktlaunch
+    # Its own temporary folder, as it writes many log lines there.
+    local folder=$root/build/bench temp=$root/build/bench/temp status=0
+    mkdir -p "$folder"
+    (cd "$folder" && "$root/cmake/wine-run" --temp "$temp" "$root/build/windows/bin/ktbench.exe" --page=index.html \
+        ${1:+--benchmark_filter="$1"} "${@:2}") || status=$?
+    rm -rf "$temp"
+    return $status
 }
 
 command_sanitize() {

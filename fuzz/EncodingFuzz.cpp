@@ -1,5 +1,6 @@
 // EncodingFuzz.cpp: any bytes as UTF-8, and any bytes as UTF-16, against plain converters.
 
+#include "OUtf.h"
 #include "Units.h"
 
 #include <cstdint>
@@ -23,6 +24,7 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const *data, std::size_t size
     OString const decoded = OString::FromUTF8(bytes);
     Check(decoded.GetUnits() == KTUnits(expected.begin(), expected.end()));
     Check(decoded.GetUTF8() == ReferenceEncode(expected));
+    Check(OUtf8ToUnitsBaseline(bytes) == decoded.GetUnits());
     Check(KTString(bytes.c_str(), KTString::kKTEncodingBytes).size() == std::strlen(bytes.c_str()));
 
     Units units(size / 2);
@@ -31,6 +33,7 @@ extern "C" int LLVMFuzzerTestOneInput(std::uint8_t const *data, std::size_t size
     }
     KTString const text = FromUnits(units);
     Check(text.GetUTF8String() == ReferenceEncode(units));
+    Check(OUnitsToUtf8Baseline(units.data(), units.size()) == text.GetUTF8String());
     Check(KTString(text.c_str()).size() == KTUnitTraits::length(text.c_str()));
     return 0;
 }

@@ -19,6 +19,9 @@ std::size_t OUnitLength(unsigned short const *text) noexcept;
 /// Decodes UTF-8 (Unicode 15, section 3.9): every maximal ill-formed part of the input becomes one U+FFFD.
 KTUnits OUtf8ToUnits(std::string_view bytes);
 
+/// The same for zero-terminated text, which is read once less where it is ASCII. REQUIRES: text is not null.
+KTUnits OUtf8TextToUnits(char const *text);
+
 /// Encodes as UTF-8; an unpaired surrogate becomes U+FFFD.
 std::string OUnitsToUtf8(unsigned short const *units, std::size_t count);
 
@@ -33,3 +36,8 @@ KTUnits OWideToUnits(wchar_t const *text, std::size_t count);
 
 /// One wide character for each unit.
 std::wstring OUnitsToWide(unsigned short const *units, std::size_t count);
+
+/// The two conversions as every x86-64 processor can do them. The ones above take these where it has nothing better;
+/// apart from that they are for tests.
+KTUnits OUtf8ToUnitsBaseline(std::string_view bytes);
+std::string OUnitsToUtf8Baseline(unsigned short const *units, std::size_t count);

@@ -49,7 +49,7 @@ KTUnits FromBytes(char const *bytes, KTString::KTCharEncodingType encoding) {
     case KTString::kKTEncodingBytes:
         return OWidenSigned({bytes, OByteLength(bytes)});
     case KTString::kKTEncodingUTF8:
-        return OUtf8ToUnits({bytes, OByteLength(bytes)});
+        return OUtf8TextToUnits(bytes);
     }
     return {};
 }

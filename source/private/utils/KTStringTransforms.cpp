@@ -15,6 +15,35 @@ KTBool16 ContainsAnyOf(KTString const &text, char const *set) {
     return static_cast<KTBool16>(text.find_first_of(KTString(set)) != KTString::npos);
 }
 
+bool EndsWith(KTUnits const &text, KTUnits const &end) {
+    return text.size() >= end.size() && text.compare(text.size() - end.size(), end.size(), end) == 0;
+}
+
+// Replaces the first occurrence of `find` until there is none left, as if each search began anew: what a replacement
+// creates, on its own or with its neighbours, is replaced too.
+//
+// One pass does that. `done` never holds an occurrence; units move to its end one by one, and the first occurrence of
+// the whole text is the one that the moved unit completes. Its replacement goes in front of what is still to come:
+//
+//     done | pending, last unit first | rest of the text
+KTUnits ReplacedFromTheBeginning(KTUnits const &text, KTUnits const &find, KTUnits const &with) {
+    KTUnits done;
+    KTUnits pending;
+    for (std::size_t next = 0; next < text.size() || !pending.empty();) {
+        if (pending.empty()) {
+            done.push_back(text[next++]);
+        } else {
+            done.push_back(pending.back());
+            pending.pop_back();
+        }
+        if (done.back() == find.back() && EndsWith(done, find)) {
+            done.resize(done.size() - find.size());
+            pending.append(with.rbegin(), with.rend());
+        }
+    }
+    return done;
+}
+
 } // namespace
 
 KTBool16 KTString::Contains(KTString const &text) const { return static_cast<KTBool16>(find(text) != npos); }
@@ -30,16 +59,13 @@ KTBool16 KTString::IsPermissableFileName() const {
 }
 
 KTString &KTString::ReplaceAll(KTString const &find, KTString const &with) {
-    // Copies, as the caller may hand in this string itself.
-    KTString const needle = find;      // NOLINT(performance-unnecessary-copy-initialization)
-    KTString const replacement = with; // NOLINT(performance-unnecessary-copy-initialization)
-    // Each search begins anew, so that what a replacement creates is replaced too. Nothing was found before the last
-    // occurrence, and the next one can at most begin a needle's length before it: starting there finds the same.
-    size_type at = m_Units.find(needle.m_Units);
-    while (at != npos) {
-        replace(at, needle.size(), replacement);
-        size_type const overlap = needle.empty() ? 0 : needle.size() - 1;
-        at = m_Units.find(needle.m_Units, at > overlap && !needle.empty() ? at - overlap : 0);
+    if (find.empty()) {
+        for (KTString const text = with;;) { // an empty text is found at the beginning, again and again
+            insert(0, text);
+        }
+    }
+    if (m_Units.find(find.m_Units) != npos) {
+        m_Units = ReplacedFromTheBeginning(m_Units, find.m_Units, with.m_Units);
     }
     return *this;
 }
