@@ -237,8 +237,12 @@ command_fuzz() {
         local corpus=$root/build/fuzz/$name
         mkdir -p "$corpus"
         echo "kt: fuzzing $name for $seconds s"
-        (cd "$root/build/fuzz" && "$target" -max_total_time="$seconds" -timeout=10 -rss_limit_mb=2048 -print_final_stats=1 \
-            -verbosity=0 "$corpus" "$root/fuzz/corpus/$name") || fail "fuzz target $name failed"
+        (cd "$root/build/fuzz" && "$target" -max_total_time="$seconds" -timeout=10 -rss_limit_mb=2048 \
+            -print_final_stats=1 "$corpus" "$root/fuzz/corpus/$name") >"$root/build/fuzz/$name.log" 2>&1 || {
+            tail -n 40 "$root/build/fuzz/$name.log" >&2
+            fail "fuzz target $name failed; the input is in build/fuzz/ (build/fuzz/$name.log)"
+        }
+        grep -h 'number_of_executed_units' "$root/build/fuzz/$name.log"
     done
 }
 
