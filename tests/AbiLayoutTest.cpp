@@ -10,6 +10,11 @@
 //         16  std::ofstream *  the log file
 //         24  KTMutex
 //         40  KTPath           the log file's path, up to 80
+//
+//     KTTime, 16 bytes             KTDuration, 24 bytes
+//          0  virtual table             0  virtual table
+//          8  u64  count                8  KTReal  amount
+//                                      16  i32     unit
 
 #include "KTPublic.h"
 #include "VTable.h"
@@ -127,7 +132,27 @@ TEST(AbiLayoutTest, LoggersFieldsStandInOrder) {
     EXPECT_EQ(static_cast<void const *>(bytes + 40), static_cast<void const *>(&gKTLogger->GetLogFilePath()));
 }
 
+// The value at an offset of an object.
+template <typename T> T ValueAt(void const *object, std::size_t offset) {
+    T value{};
+    std::memcpy(&value, static_cast<std::byte const *>(object) + offset, sizeof value);
+    return value;
+}
+
+TEST(AbiLayoutTest, TimesAndDurationsHaveTheirFieldsInOrder) {
+    KTTime const time(0x0123456789ABCDEF);
+    EXPECT_EQ(16U, sizeof(KTTime));
+    EXPECT_EQ(0x0123456789ABCDEFU, ValueAt<KTUInt64>(&time, 8));
+
+    KTDuration const duration(2.5, static_cast<KTDurationUnitOfMeasure>(0x01020304));
+    EXPECT_EQ(24U, sizeof(KTDuration));
+    EXPECT_EQ(2.5, ValueAt<double>(&duration, 8));
+    EXPECT_EQ(0x01020304, ValueAt<int>(&duration, 16));
+}
+
 TEST(AbiLayoutTest, NumbersAreFixed) {
+    EXPECT_EQ(0, static_cast<int>(kKTDurationSeconds));
+    EXPECT_EQ(4U, sizeof(KTDurationUnitOfMeasure));
     EXPECT_EQ(0, static_cast<int>(kKTErrorNone));
     EXPECT_EQ(1, static_cast<int>(kKTErrorFailed));
     EXPECT_EQ(28, static_cast<int>(kKTErrorFileNotFound));

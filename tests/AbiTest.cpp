@@ -22,6 +22,11 @@ VTableRow const kTables[] = {
     VTableOf<WKTLogger>({"WKTLogger::Log(std::wstring const&)", "WKTLogger::Log(wchar_t const*, ...)",
                          "WKTLogger::Log(std::string const&)", "KTLogger::Log(char const*, ...)", "~"}),
     VTableOf<KTPath>({"~"}),
+    VTableOf<KTTime>({"~"}),
+    VTableOf<KTDuration>({"~", "KTDuration::GetTime() const", "KTDuration::GetTimeInDeciSeconds() const",
+                          "KTDuration::GetTimeWithFullPrecision() const", "KTDuration::SetTime(KTReal)",
+                          "KTDuration::SetDurationUnitOfMeasure(KTDurationUnitOfMeasure)",
+                          "KTDuration::GetDurationUnitOfMeasure() const"}),
     VTableOf<KTFile>({"~", "KTFile::PathChanged(OString const&)"}),
     VTableOf<KTMutex>({"~"}),
     VTableOf<KTRecursiveMutex>({"~"}),
@@ -97,6 +102,8 @@ TEST(AbiTest, ObjectsPointToTheLibrarysTables) {
     KTCondition const condition;
     KTPath const path;
     KTFile const file;
+    KTTime const time;
+    KTDuration const duration;
     EXPECT_EQ(ExportedTable<KTMutex>(), TableOfObject(&mutex));
     EXPECT_EQ(ExportedTable<KTRecursiveMutex>(), TableOfObject(&recursiveMutex));
     EXPECT_EQ(ExportedTable<KTLock>(), TableOfObject(&lock));
@@ -104,6 +111,8 @@ TEST(AbiTest, ObjectsPointToTheLibrarysTables) {
     EXPECT_EQ(ExportedTable<KTCondition>(), TableOfObject(&condition));
     EXPECT_EQ(ExportedTable<KTPath>(), TableOfObject(&path));
     EXPECT_EQ(ExportedTable<KTFile>(), TableOfObject(&file));
+    EXPECT_EQ(ExportedTable<KTTime>(), TableOfObject(&time));
+    EXPECT_EQ(ExportedTable<KTDuration>(), TableOfObject(&duration));
     EXPECT_EQ(ExportedTable<WKTLogger>(), TableOfObject(gKTLogger));
 }
 
@@ -120,6 +129,8 @@ TEST(AbiTest, DerivedDestructorsRunThroughTheFirstSlot) {
     KTRecursiveMutex recursiveMutex;
     ExpectDestructorFirst<KTPath>();
     ExpectDestructorFirst<KTFile>();
+    ExpectDestructorFirst<KTTime>();
+    ExpectDestructorFirst<KTDuration>();
     ExpectDestructorFirst<KTMutex>();
     ExpectDestructorFirst<KTRecursiveMutex>();
     ExpectDestructorFirst<KTLock>(mutex);
