@@ -180,6 +180,11 @@ TEST(AbiLayoutTest, TypesAreFixed) {
     EXPECT_EQ(sizeof(void *), sizeof(CComBSTR));
     EXPECT_EQ(8U + sizeof(KTUnits), sizeof(KTPath));
     EXPECT_EQ(8U + sizeof(KTUnits), sizeof(KTFile));
+    EXPECT_EQ(sizeof(std::vector<KTFile>), sizeof(KTTempFileHolder));
+    EXPECT_EQ(4U, sizeof(KTFileUtil::ErrorCodeEnum));
+    EXPECT_EQ(4U, sizeof(KTFile::AccessMode));
+    EXPECT_EQ(4U, sizeof(KTFile::ShareMode));
+    EXPECT_EQ(4U, sizeof(KTFile::TimeAttribute));
 }
 
 } // namespace

@@ -25,25 +25,56 @@ std::size_t RootLength(KTUnits const &text) {
     return afterShare == KTUnits::npos ? text.size() : afterShare;
 }
 
+// Where the last element begins and ends; nothing of it may lie in the root.
+struct Span {
+    std::size_t begin = 0;
+    std::size_t end = 0;
+};
+
+Span LastElement(KTUnits const &text) {
+    std::size_t const root = RootLength(text);
+    std::size_t const last = text.find_last_not_of(kSeparators);
+    if (last == KTUnits::npos || last < root) {
+        return {};
+    }
+    std::size_t const separator = text.find_last_of(kSeparators, last);
+    bool const isFirst = separator == KTUnits::npos || separator < root;
+    return {isFirst ? root : separator + 1, last + 1};
+}
+
+// Where the extension begins; the element's end if it has none.
+std::size_t ExtensionStart(KTUnits const &text, Span name) {
+    if (name.begin == name.end) {
+        return name.end;
+    }
+    std::size_t const dot = text.rfind('.', name.end - 1);
+    return dot == KTUnits::npos || dot <= name.begin ? name.end : dot;
+}
+
+OString Part(KTUnits const &text, std::size_t begin, std::size_t end) { return {text.data() + begin, end - begin}; }
+
 } // namespace
 
 OPath::OPath(OString text) : m_Text(std::move(text)) {}
 
 void OPath::Append(OString const &element) {
-    KTUnits text = m_Text.GetUnits();
-    std::size_t const name = element.GetUnits().find_first_not_of(kSeparators);
-    if (text.empty()) {
+    if (m_Text.empty()) {
         m_Text = element;
         return;
     }
-    if (name == KTUnits::npos) {
+    KTUnits const &name = element.GetUnits();
+    std::size_t const start = name.find_first_not_of(kSeparators);
+    if (start == KTUnits::npos) {
         return;
     }
-    if (!IsSeparator(text.back())) {
-        text.push_back('\\');
+    if (&element == &m_Text) {
+        Append(OString(element));
+        return;
     }
-    text.append(element.GetUnits(), name);
-    m_Text = OString(std::move(text));
+    if (!IsSeparator(m_Text.GetUnits().back())) {
+        m_Text.Append(kSeparators, 1);
+    }
+    m_Text.Append(name.data() + start, name.size() - start);
 }
 
 OPath OPath::GetParent() const {
@@ -60,6 +91,41 @@ OPath OPath::GetParent() const {
     std::size_t const folderEnd = text.find_last_not_of(kSeparators, cut);
     std::size_t const kept = folderEnd == KTUnits::npos ? 0 : folderEnd + 1;
     return OPath(OString(text.substr(0, kept < root ? root : kept)));
+}
+
+OString OPath::GetFileName() const {
+    Span const name = LastElement(m_Text.GetUnits());
+    return Part(m_Text.GetUnits(), name.begin, name.end);
+}
+
+OString OPath::GetBaseName() const {
+    KTUnits const &text = m_Text.GetUnits();
+    Span const name = LastElement(text);
+    return Part(text, name.begin, ExtensionStart(text, name));
+}
+
+OString OPath::GetExtension() const {
+    KTUnits const &text = m_Text.GetUnits();
+    Span const name = LastElement(text);
+    return Part(text, ExtensionStart(text, name), name.end);
+}
+
+std::vector<OString> OPath::GetComponents() const {
+    KTUnits const &text = m_Text.GetUnits();
+    std::vector<OString> components;
+    std::size_t const root = RootLength(text);
+    if (root != 0) {
+        std::size_t const last = text.find_last_not_of(kSeparators, root - 1);
+        components.push_back(Part(text, 0, last == KTUnits::npos ? 1 : last + 1));
+    }
+    std::size_t begin = text.find_first_not_of(kSeparators, root);
+    while (begin != KTUnits::npos) {
+        std::size_t end = text.find_first_of(kSeparators, begin);
+        end = end == KTUnits::npos ? text.size() : end;
+        components.push_back(Part(text, begin, end));
+        begin = text.find_first_not_of(kSeparators, end);
+    }
+    return components;
 }
 
 void OPath::ReplaceBackSlashes() {

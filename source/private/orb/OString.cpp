@@ -16,6 +16,12 @@ OString::OString(unsigned short const *units, std::size_t count) {
     }
 }
 
+void OString::Append(unsigned short const *units, std::size_t count) {
+    if (count != 0) {
+        m_Units.append(units, count);
+    }
+}
+
 OString OString::FromUTF8(std::string_view bytes) { return OString(OUtf8ToUnits(bytes)); }
 
 std::string OString::GetUTF8() const { return OUnitsToUtf8(m_Units.data(), m_Units.size()); }

@@ -6,6 +6,8 @@
 
 #include "OString.h"
 
+#include <vector>
+
 #include "KTBeginExports.h"
 
 /// A path of the file layer. Distinct values may be used from any thread; one value is not locked.
@@ -30,6 +32,20 @@ class KT_PUBLIC_API OPath {
     /// The containing folder without a trailing separator, except that the root of a drive keeps it ("C:\"). A root,
     /// a single element and the empty path have no parent: empty.
     OPath GetParent() const;
+
+    /// The last element, without separators; empty for a root and the empty path.
+    OString GetFileName() const;
+
+    /// The last element up to its last dot. A dot that begins the name is part of it: ".profile" has no extension.
+    OString GetBaseName() const;
+
+    /// The last element from its last dot on, the dot included, so that base name and extension give the name again;
+    /// empty if it has none.
+    OString GetExtension() const;
+
+    /// The elements in order: first the root without a separator at its end ("C:", "\\server\share", or "\" for a
+    /// path that begins with one separator), if there is one, then the names.
+    std::vector<OString> GetComponents() const;
 
     /// Turns every "\" into "/".
     void ReplaceBackSlashes();

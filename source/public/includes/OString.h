@@ -48,6 +48,10 @@ class KT_PUBLIC_API OString {
     /// The units as a standard string.
     KTUnits const &GetUnits() const { return m_Units; }
 
+    /// Adds `count` units at the end. REQUIRES: units is not null unless count is 0. Throws std::bad_alloc, or
+    /// std::length_error past the longest string; the text is unchanged then.
+    void Append(unsigned short const *units, std::size_t count);
+
     /// Whether any unit of `set` occurs in this text, matched as `flags` (AnyOfFlags) says. An empty set never does.
     bool ContainsAny(OString const &set, unsigned long flags = kAnyOfExact) const;
 
