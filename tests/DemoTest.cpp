@@ -202,6 +202,36 @@ TEST_F(Demo, CourseChecksAllHold) {
     EXPECT_EQ(outcome.Row("dictionary texts"), "dictionary texts that could name a file 30 of 38");
 }
 
+TEST_F(Demo, CourseFilesAreMeasuredCopiedAndTheCopyIsRemoved) {
+    Write("a.txt", "one\n");
+    Write("sub/b.bin", "12345");
+    Outcome const outcome = CheckEmptyError(RunOnFolder());
+    std::size_t const start = outcome.out.find("Files on the disk\n");
+    ASSERT_NE(start, std::string::npos) << outcome.out;
+    Outcome section;
+    section.out = outcome.out.substr(start);
+    EXPECT_EQ(section.Row("File"), "File Bytes Created Changed");
+    EXPECT_TRUE(section.Row("a.txt").starts_with("a.txt 4 20")) << outcome.out;
+    std::string const row = section.Row("sub\\b.bin");
+    EXPECT_TRUE(row.starts_with("sub\\b.bin 5 20")) << outcome.out;
+    EXPECT_EQ(row.size(), std::string("sub\\b.bin 5 2026-01-02 03:04 2026-01-02 03:04").size()) << row;
+    EXPECT_TRUE(section.Has("\n  copied to the session folder: 2 of 2\n")) << outcome.out;
+    EXPECT_TRUE(section.Has("\\temp\\KTSession-"));
+    for (auto const &entry : fs::directory_iterator(m_Temp)) {
+        EXPECT_FALSE(entry.path().filename().wstring().starts_with(L"KT")) << entry.path();
+    }
+}
+
+TEST_F(Demo, ACourseThatCannotBeCopiedIsStillShown) {
+    Write("free.txt", "one\n");
+    Write("used.txt", "two\n");
+    Handle const used(CreateFileW((m_Folder / "used.txt").c_str(), GENERIC_READ | GENERIC_WRITE, 0, nullptr,
+                                  OPEN_EXISTING, 0, nullptr));
+    Outcome const outcome = RunOnFolder();
+    EXPECT_EQ(outcome.status, 0U);
+    EXPECT_TRUE(outcome.Has("not copied to the session folder: too large, or a file cannot be read\n"));
+}
+
 TEST_F(Demo, LogIsWhereItSaysAndHasAsManyLines) {
     Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
     std::string const log = ReadAll(m_Temp / "ktap_log.txt");
