@@ -69,5 +69,6 @@ void AddTextBenchmarks();
 void AddLoggerBenchmarks();
 void AddLockBenchmarks();
 void AddGrowthBenchmarks();
+void AddFileBenchmarks();
 
 } // namespace bench

@@ -49,6 +49,7 @@ int main(int argc, char **argv) {
     bench::AddLoggerBenchmarks();
     bench::AddLockBenchmarks();
     bench::AddGrowthBenchmarks();
+    bench::AddFileBenchmarks();
 
     bench::Report report;
     if (benchmark::RunSpecifiedBenchmarks(&report) == 0) {
