@@ -61,7 +61,7 @@ void DescribeGroup(std::string group, std::string text);
 void DescribeGrowthGroup(std::string group, std::string text);
 
 /// Sets a target: in this group the library's speed is at least `speed` times that of the peer.
-void ExpectSpeed(std::string group, std::string peer, double speed);
+void ExpectSpeed(std::string const &group, std::string peer, double speed);
 
 // ---- what each file brings ----
 

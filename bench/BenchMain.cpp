@@ -37,6 +37,7 @@ int main(int argc, char **argv) {
     std::string page;
     std::vector<std::string> arguments = TakeArguments(argc, argv, page);
     std::vector<char *> pointers;
+    pointers.reserve(arguments.size());
     for (std::string &argument : arguments) {
         pointers.push_back(argument.data());
     }

@@ -100,7 +100,7 @@ void PlaceInReport(Task const &task, std::string const &contender) {
     FindOrAdd(row.contenders, contender);
 }
 
-void ExpectSpeed(std::string group, std::string peer, double speed) {
+void ExpectSpeed(std::string const &group, std::string peer, double speed) {
     FindOrAdd(DescribedGroups(), group).targets[std::move(peer)] = speed;
 }
 
@@ -158,7 +158,9 @@ void Report::ReportRuns(std::vector<Run> const &runs) {
             continue;
         }
         auto const [group, kase, size, contender] = SplitName(run.run_name.function_name);
-        Row &row = FindOrAdd(FindOrAdd(m_Groups, group).rows, kase + '/' + size);
+        std::string name = kase;
+        name.append(1, '/').append(size);
+        Row &row = FindOrAdd(FindOrAdd(m_Groups, group).rows, name);
         FindOrAdd(row.contenders, contender)
             .seconds.push_back(run.real_accumulated_time / static_cast<double>(run.iterations));
     }

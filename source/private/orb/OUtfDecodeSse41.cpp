@@ -150,12 +150,12 @@ O_SSE41_INLINE void ScanWide(Scanner &s, Byte const *from) {
 constexpr Packings MakePackings() {
     Packings packings{};
     for (unsigned lanes = 0; lanes < 256; ++lanes) {
-        Byte *const shuffle = packings.shuffles[lanes];
+        Byte *shuffle = packings.shuffles[lanes];
         Byte &size = packings.sizes[lanes];
         for (unsigned lane = 0; lane < 8; ++lane) {
             if ((lanes >> lane & 1U) != 0) {
-                shuffle[2U * size] = static_cast<Byte>(2 * lane);
-                shuffle[2U * size + 1] = static_cast<Byte>(2 * lane + 1);
+                *shuffle++ = static_cast<Byte>(2 * lane);
+                *shuffle++ = static_cast<Byte>(2 * lane + 1);
                 ++size;
             }
         }
