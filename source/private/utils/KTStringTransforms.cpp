@@ -60,7 +60,9 @@ KTBool16 KTString::IsPermissableFileName() const {
 
 KTString &KTString::ReplaceAll(KTString const &find, KTString const &with) {
     if (find.empty()) {
-        for (KTString const text = with;;) { // an empty text is found at the beginning, again and again
+        // An empty text is found at the beginning, again and again. A copy, as the caller may hand in this string itself.
+        KTString const text = with; // NOLINT(performance-unnecessary-copy-initialization)
+        for (;;) {
             insert(0, text);
         }
     }
