@@ -36,7 +36,7 @@ struct Size {
     std::size_t bytes;
 };
 
-constexpr Size kSizes[] = {{"64", 64}, {"1K", 1024}, {"64K", 64U * 1024U}, {"1M", 1024U * 1024U}};
+constexpr Size kSizes[] = {{"64", 64}, {"1K", 1024}, {"64K", 65536}, {"1M", 1048576}};
 
 std::wstring SystemWiden(char const *bytes) {
     int const size = static_cast<int>(std::strlen(bytes));
@@ -133,7 +133,7 @@ void AddTextBenchmarks() {
             Task const encode{kEncode, NameOf(script), size.name};
             AddDecode(decode, bytes);
             AddEncode(encode, bytes);
-            if (script == Script::kAscii && size.bytes == 64U * 1024U) {
+            if (script == Script::kAscii && size.bytes == kSizes[2].bytes) {
                 AddMemcpy(decode, "memcpy", size.bytes * 3 / 2);
                 AddMemcpy(decode, "memcpy-source", size.bytes);
                 AddMemcpy(encode, "memcpy", size.bytes * 3 / 2);
