@@ -89,15 +89,19 @@ private_apt() {
         -o APT::Sandbox::User= "$@"
 }
 
-# Writes the system's Debian archives as source archives.
+# Writes the system's Debian archives as source archives; the file is empty where apt does not know them yet.
+list_source_archives() {
+    local form='deb-src [signed-by=/usr/share/keyrings/debian-archive-keyring.gpg] $(SITE) $(RELEASE) $(COMPONENT)'
+    apt-get indextargets --format "$form" 'Created-By: Packages' 'Origin: Debian' |
+        sort -u >"$root/build/apt/sources.list"
+}
+
 write_source_list() {
     mkdir -p "$root/build/apt/lists/partial" "$root/build/apt/cache/archives/partial"
-    apt-get indextargets --format 'deb-src [signed-by=/usr/share/keyrings/debian-archive-keyring.gpg] $(SITE) $(RELEASE) $(COMPONENT)' \
-        'Created-By: Packages' 'Origin: Debian' | sort -u >"$root/build/apt/sources.list"
+    list_source_archives
     [ -s "$root/build/apt/sources.list" ] && return
     as_root apt-get update >"$stamps/apt.log" 2>&1 || fail "apt-get update failed: is the network there? (build/setup/apt.log)"
-    apt-get indextargets --format 'deb-src [signed-by=/usr/share/keyrings/debian-archive-keyring.gpg] $(SITE) $(RELEASE) $(COMPONENT)' \
-        'Created-By: Packages' 'Origin: Debian' | sort -u >"$root/build/apt/sources.list"
+    list_source_archives
     [ -s "$root/build/apt/sources.list" ] || fail "found no Debian archive among this machine's package sources"
 }
 
