@@ -6,9 +6,7 @@
 #include <gtest/gtest.h>
 
 #include <climits>
-#include <cmath>
 #include <ios>
-#include <limits>
 
 namespace {
 
@@ -127,36 +125,6 @@ TEST(StringNumbers, TextWithoutANumberReadsAsZero) {
         EXPECT_EQ(string.GetDoubleValue(), 0.0) << text;
         EXPECT_EQ(KTString("xyz").GetPointerValue(), nullptr) << text;
     }
-}
-
-TEST(Real, CompoundOperatorsActOnTheDouble) {
-    KTReal value(3.0);
-    value += KTReal(2.0);
-    value *= KTReal(4.0);
-    value -= KTReal(6.0);
-    value /= KTReal(4.0);
-    EXPECT_EQ(value.AsDouble(), 3.5);
-    EXPECT_EQ(KTReal().AsDouble(), 0.0);
-}
-
-TEST(Real, ConvertsByTruncationWithinTheLimits) {
-    LogLines log;
-    EXPECT_EQ(static_cast<KTInt32>(KTReal(2.9)), 2);
-    EXPECT_EQ(static_cast<KTInt32>(KTReal(-2.9)), -2);
-    EXPECT_EQ(static_cast<KTInt32>(KTReal(2147483647.0)), INT_MAX);
-    EXPECT_EQ(static_cast<KTInt32>(KTReal(-2147483648.0)), INT_MIN);
-    EXPECT_EQ(static_cast<KTInt32>(KTReal(std::nan(""))), 0);
-    EXPECT_EQ(log.Take(), Lines{});
-}
-
-TEST(Real, ConversionsPastTheLimitsAreReported) {
-    LogLines log;
-    EXPECT_EQ(static_cast<KTInt32>(KTReal(3e9)), INT_MAX);
-    EXPECT_EQ(log.Take(), Lines{"Assert failed: Value 3000000000.0000 is too large to convert to KTInt32 at "
-                                "source/public/includes/KTReal:432"});
-    EXPECT_EQ(static_cast<KTInt32>(KTReal(-2147483648.5)), INT_MIN);
-    EXPECT_EQ(log.Take(), Lines{"Assert failed: Value -2147483648.5000 is too small to convert to KTInt32 at "
-                                "source/public/includes/KTReal:431"});
 }
 
 TEST(StringPredicates, ContainsFindsTexts) {
