@@ -18,6 +18,7 @@
 #include "KTPublicUtils.h"
 #include "KTReal.h"
 #include "KTString.h"
+#include "KTSystemUtils.h"
 #include "KTTempFileHolder.h"
 #include "KTTime.h"
 #include "KTTypes.h"

@@ -1,0 +1,61 @@
+// WOGuid.cpp: identifiers from the system's remote procedure call library.
+
+#include "OGuid.h"
+
+#include <windows.h>
+
+#include <rpc.h>
+
+#include <array>
+#include <cstddef>
+
+namespace {
+
+constexpr std::size_t kLength = 36; // 32 digits and 4 hyphens
+
+// The text that the library allocated for an identifier, freed by the library.
+class RpcText {
+  public:
+    RpcText() = default;
+    RpcText(RpcText const &) = delete;
+    RpcText &operator=(RpcText const &) = delete;
+    ~RpcText() {
+        if (m_Text != nullptr) {
+            RpcStringFreeW(&m_Text);
+        }
+    }
+
+    bool Write(UUID &id) { return UuidToStringW(&id, &m_Text) == RPC_S_OK && m_Text != nullptr; }
+    RPC_WSTR Get() const { return m_Text; }
+
+  private:
+    RPC_WSTR m_Text = nullptr;
+};
+
+// The system answers RPC_S_UUID_LOCAL_ONLY where the machine has no network card to tell it from others: unique among
+// all that this machine makes, which serves as well.
+bool Generate(UUID &id) {
+    RPC_STATUS const status = UuidCreate(&id);
+    return status == RPC_S_OK || status == RPC_S_UUID_LOCAL_ONLY;
+}
+
+} // namespace
+
+OGuidResult OMakeGuid(KTUnits &text) {
+    UUID id{};
+    if (!Generate(id)) {
+        return OGuidResult::kNotGenerated;
+    }
+    RpcText systemText;
+    if (!systemText.Write(id)) {
+        return OGuidResult::kNotWritten;
+    }
+    std::array<unsigned short, kLength + 1> buffer{};
+    std::size_t length = 0;
+    while (length < kLength && systemText.Get()[length] != 0) {
+        buffer[length] = systemText.Get()[length];
+        ++length;
+    }
+    text.assign(buffer.data(), length);
+    return OGuidResult::kMade;
+}
