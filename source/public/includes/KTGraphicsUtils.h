@@ -1,0 +1,22 @@
+// KTGraphicsUtils.h: the static toolbox of the renderer's value types. Conventions are those of KTGraphicsStructs.h.
+
+#pragma once
+
+#include "KTGraphicsStructs.h"
+
+#include "KTBeginExports.h"
+
+class KT_PUBLIC_API KTGraphicsUtils {
+  public:
+    KTGraphicsUtils() = delete;
+
+    /// The point where the infinite line through `a` and `b` meets the plane. Computed in double precision.
+    ///
+    /// A line in the plane gives `a`. A line parallel to the plane and beside it, and a plane with a zero normal, have
+    /// no such point: all three coordinates are NaN then (KTVector3f::IsFinite tells). The same point twice is no line:
+    /// it gives that point if it lies in the plane, else NaN. Parallel means: within the rounding of float, 4 units in
+    /// the last place, of a right angle to the normal. Any thread; throws nothing.
+    static KTVector3f GetIntersectionOfLineWithPlane(KTVector3f const &a, KTVector3f const &b, KTPlanef const &plane);
+};
+
+#include "KTEndExports.h"
