@@ -110,13 +110,13 @@ struct KT_PUBLIC_API KTPlanef {
     /// The plane through the point, across the normal, which need not have length 1. No plane if the normal is zero.
     static KTPlanef FromPointAndNormal(KTVector3f const &point, KTVector3f const &normal);
 
-    /// The plane through three points, which its front sees counter-clockwise. No plane if they lie on one line.
+    /// The plane through three points, which its front sees counter-clockwise. No plane if they lie exactly on one line.
     static KTPlanef FromPoints(KTVector3f const &a, KTVector3f const &b, KTVector3f const &c);
 
-    /// Whether there is a plane: the normal is finite and not zero.
+    /// Whether there is a plane: all coefficients are finite and the normal is not zero.
     bool IsValid() const;
 
-    /// The distance of the point: positive in front, negative behind. 0 if there is no plane.
+    /// The distance of the point: positive in front, negative behind. NaN if there is no plane.
     float DistanceTo(KTVector3f const &point) const;
 
     friend constexpr bool operator==(KTPlanef const &a, KTPlanef const &b) = default;

@@ -32,7 +32,8 @@ class KT_PUBLIC_API KTInterpolator {
     /// Linear: (to - from) * t + from. A `t` outside [0, 1], or NaN, throws KTLCException, "kKTErrorInternal".
     /// Eased: a `t` below 0 gives `from`, 1 and above give `to`, NaN gives NaN; nothing is thrown. With
     /// a = (to - from) / 0.21 and v = 0.3 * a, the curve is a / 2 * t^2 up to 0.3, goes on at speed v up to 0.7, and
-    /// ends with -a / 2 * (t - 0.7)^2 on top of that speed.
+    /// ends with -a / 2 * (t - 0.7)^2 on top of that speed. Results are the same bit by bit on every machine; for floats
+    /// 0.21 is 0.3F * 0.7F.
     /// Any other mode throws KTLCException, "kKTErrorInternal". NaN and infinite ends follow IEEE 754.
     static float Interpolate(float const &from, float const &to, float const &t);
     static double Interpolate(double const &from, double const &to, double const &t);

@@ -43,12 +43,12 @@ struct KT_PUBLIC_API KTPoint {
 
     // ---- angles, in radians ----
 
-    /// The angle of this vector from the positive x axis, above -pi up to pi; 0 for the zero vector. NaN coordinates
-    /// give NaN.
+    /// The angle of this vector from the positive x axis, from -pi to pi; pi for the negative x axis, 0 for the zero
+    /// vector. NaN coordinates give NaN.
     double VectorAngle() const;
 
-    /// The angle that turns this vector to the direction of the other one, above -pi up to pi; 0 when either is the
-    /// zero vector.
+    /// The angle that turns this vector to the direction of the other one, from -pi to pi; 0 when either is the zero
+    /// vector. Infinite and NaN coordinates give NaN, or what IEEE 754 makes of them.
     double VectorAngle(KTPoint const &other) const;
 
     /// This point turned about `center` by `radians`. A point that is its own centre stays exactly.
@@ -61,7 +61,8 @@ struct KT_PUBLIC_API KTPoint {
     KTPoint ProjectOnLine(KTPoint const &a, KTPoint const &b) const;
 
     /// The point of the rectangle, edges included, that lies nearest to this one; a point inside stays. Inverted
-    /// rectangles are taken normalised, empty ones are a line or a point. A NaN coordinate stays NaN.
+    /// rectangles are taken normalised, empty ones are a line or a point. A NaN coordinate stays NaN, and a NaN
+    /// edge constrains nothing.
     KTPoint ConstrainTo(KTRect const &bounds) const;
 
     // ---- arithmetic and comparison, by coordinate ----
