@@ -15,6 +15,19 @@
 //          0  virtual table             0  virtual table
 //          8  u64  count                8  KTReal  amount
 //                                      16  i32     unit
+//
+//     KTColor, 56 bytes                        KTARGB, 32 bytes
+//          0  virtual table                         0  KTReal  alpha
+//          8  i32                  colour space     8  KTReal  red
+//         16  std::vector<KTReal>  components      16  KTReal  green
+//         40  KTReal               alpha           24  KTReal  blue
+//         48  KTReal               transparency factor
+//
+//     KTPoint: f64 x, y                        KTRect, KTIntRect: f64 or i32 left, top, right, bottom
+//     KTVector3f: f32 x, y, z                  KTColor4f: f32 red, green, blue, alpha
+//     KTPlanef: KTVector3f normal, f32 d       KTMatrix4x4f: 16 f32, column by column
+//     KTQuad3D: KTVector3f bottom left, bottom right, top right, top left
+//     KTTransform: KTMatrix4x4f, KTColor4f     KTKeyframe: KTTransform, i32 frame
 
 #include "KTPublic.h"
 #include "VTable.h"
@@ -150,7 +163,65 @@ TEST(AbiLayoutTest, TimesAndDurationsHaveTheirFieldsInOrder) {
     EXPECT_EQ(0x01020304, ValueAt<int>(&duration, 16));
 }
 
+TEST(AbiLayoutTest, ColoursHaveTheirFieldsInOrder) {
+    KTColor color;
+    color.SetColorData(static_cast<KTColor::ColorSpaceEnum>(0x01020304), {0.25, 0.5});
+    color.SetAlpha(0.75);
+    color.SetTransparencyFactor(0.125);
+    EXPECT_EQ(56U, sizeof(KTColor));
+    EXPECT_EQ(ExportedTable<KTColor>(), PointerAt(&color, 0));
+    EXPECT_EQ(0x01020304, ValueAt<int>(&color, 8));
+    auto const *const components = static_cast<double const *>(PointerAt(&color, 16));
+    EXPECT_EQ(0.25, components[0]);
+    EXPECT_EQ(0.5, components[1]);
+    EXPECT_EQ(components + 2, PointerAt(&color, 24));
+    EXPECT_EQ(0.75, ValueAt<double>(&color, 40));
+    EXPECT_EQ(0.125, ValueAt<double>(&color, 48));
+
+    KTARGB const argb{1, 2, 3, 4};
+    EXPECT_EQ(32U, sizeof(KTARGB));
+    for (std::size_t i = 0; i < 4; ++i) {
+        EXPECT_EQ(static_cast<double>(i + 1), ValueAt<double>(&argb, 8 * i));
+    }
+}
+
+// The value's words are first, first + 1, ... in the order of its fields.
+template <typename Word, typename Value> void ExpectWords(Value const &value, std::size_t count, Word first) {
+    SCOPED_TRACE(typeid(Value).name());
+    EXPECT_TRUE(std::is_trivially_copyable_v<Value>);
+    EXPECT_EQ(count * sizeof(Word), sizeof(Value));
+    for (std::size_t i = 0; i < count; ++i) {
+        EXPECT_EQ(first + static_cast<Word>(i), ValueAt<Word>(&value, i * sizeof(Word)));
+    }
+}
+
+TEST(AbiLayoutTest, GeometryIsPlainNumbersInOrder) {
+    ExpectWords<double>(KTPoint(1, 2), 2, 1);
+    ExpectWords<double>(KTRect(1, 2, 3, 4), 4, 1);
+    ExpectWords<int>(KTIntRect(1, 2, 3, 4), 4, 1);
+    ExpectWords<float>(KTVector3f(1, 2, 3), 3, 1);
+    ExpectWords<float>(KTColor4f(1, 2, 3, 4), 4, 1);
+    ExpectWords<float>(KTPlanef({1, 2, 3}, 4), 4, 1);
+    ExpectWords<float>(KTQuad3D({1, 2, 3}, {4, 5, 6}, {7, 8, 9}, {10, 11, 12}), 12, 1);
+    KTMatrix4x4f const matrix({1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13, 14, 15, 16});
+    ExpectWords<float>(matrix, 16, 1);
+    ExpectWords<float>(KTTransform(matrix, {17, 18, 19, 20}), 20, 1);
+    KTKeyframe const keyframe(KTTransform(matrix, {17, 18, 19, 20}), 0x01020304);
+    EXPECT_EQ(84U, sizeof(KTKeyframe));
+    EXPECT_EQ(0x01020304, ValueAt<int>(&keyframe, 80));
+    EXPECT_TRUE(std::is_trivially_copyable_v<KTKeyframe>);
+}
+
 TEST(AbiLayoutTest, NumbersAreFixed) {
+    EXPECT_EQ(0, static_cast<int>(kKTInterpolationLinear));
+    EXPECT_EQ(1, static_cast<int>(kKTInterpolationEaseInEaseOut));
+    EXPECT_EQ(4U, sizeof(KTInterpolationModeEnum));
+    EXPECT_EQ(0, static_cast<int>(KTColor::kColorSpaceRGB));
+    EXPECT_EQ(4U, sizeof(KTColor::ColorSpaceEnum));
+    EXPECT_EQ(0, static_cast<int>(KTRect::kFirstPoint));
+    EXPECT_EQ(7, static_cast<int>(KTRect::kLastPoint));
+    EXPECT_EQ(8, static_cast<int>(KTRect::kCenter));
+    EXPECT_EQ(4U, sizeof(KTRect::RefPoint));
     EXPECT_EQ(0, static_cast<int>(kKTDurationSeconds));
     EXPECT_EQ(4U, sizeof(KTDurationUnitOfMeasure));
     EXPECT_EQ(0, static_cast<int>(kKTErrorNone));

@@ -27,6 +27,15 @@ VTableRow const kTables[] = {
                           "KTDuration::GetTimeWithFullPrecision() const", "KTDuration::SetTime(KTReal)",
                           "KTDuration::SetDurationUnitOfMeasure(KTDurationUnitOfMeasure)",
                           "KTDuration::GetDurationUnitOfMeasure() const"}),
+    VTableOf<KTColor>(
+        {"~", "KTColor::GetResultantARGB(KTARGB&) const", "KTColor::GetARGB(KTARGB&) const",
+         "KTColor::GetAlpha() const", "KTColor::SetAlpha(KTReal const&)", "KTColor::GetResultantAlpha() const",
+         "KTColor::GetTransparencyFactor()", "KTColor::SetTransparencyFactor(KTReal const&)",
+         "KTColor::GetColorSpace() const", "KTColor::GetColorData() const", "KTColor::GetNumComponents() const",
+         "KTColor::GetNthComponent(int) const", "KTColor::SetColorSpace(KTColor::ColorSpaceEnum)",
+         "KTColor::SetColorData(KTColor::ColorSpaceEnum, std::vector<KTReal, std::allocator<KTReal> > const&)",
+         "KTColor::SetColorData(std::vector<KTReal, std::allocator<KTReal> > const&)",
+         "KTColor::IsEqual(KTColor const*) const"}),
     VTableOf<KTFile>({"~", "KTFile::PathChanged(OString const&)"}),
     VTableOf<KTMutex>({"~"}),
     VTableOf<KTRecursiveMutex>({"~"}),
@@ -131,6 +140,7 @@ TEST(AbiTest, DerivedDestructorsRunThroughTheFirstSlot) {
     ExpectDestructorFirst<KTFile>();
     ExpectDestructorFirst<KTTime>();
     ExpectDestructorFirst<KTDuration>();
+    ExpectDestructorFirst<KTColor>();
     ExpectDestructorFirst<KTMutex>();
     ExpectDestructorFirst<KTRecursiveMutex>();
     ExpectDestructorFirst<KTLock>(mutex);

@@ -193,6 +193,28 @@ TEST_F(Demo, CoursePicturesAreListedWithTheirSizes) {
     EXPECT_TRUE(outcome.Row("pictures/no_entry.png").ends_with(" 96 x 96"));
 }
 
+TEST_F(Demo, CoursesWidestPictureScrollsOverTheStage) {
+    Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
+    EXPECT_TRUE(outcome.Has("\nAnimation of pictures/panorama.png on a stage of 1024 x 640\n"));
+    std::string const rows = outcome.out.substr(std::min(outcome.out.find("Animation of "), outcome.out.size()));
+    EXPECT_NE(rows.find("\n      0        0   0.00  0 to 639             0   0.00  0 to 639\n"), std::string::npos);
+    EXPECT_NE(rows.find("\n     10        0   0.08  0 to 639             0   0.40  0 to 639\n"), std::string::npos);
+    EXPECT_NE(rows.find("\n     40     -831   1.00  519 to 1159      -1133   1.00  708 to 1348\n"), std::string::npos);
+    EXPECT_NE(rows.find("\n     50    -1888   1.00  1180 to 1819     -1888   1.00  1180 to 1819\n"), std::string::npos);
+    EXPECT_NE(rows.find("\n    100    -3776   0.00  2360 to 2999     -3776   0.00  2360 to 2999\n"), std::string::npos);
+}
+
+TEST_F(Demo, WithoutAReadablePictureNothingIsAnimated) {
+    Write("fake.png", "no picture");
+    // The start of a picture without width, and of one without height.
+    std::string const start = "\x89PNG\r\n\x1A\n\0\0\0\x0DIHDR"s;
+    Write("thin.png", start + "\0\0\0\0\0\0\0\1"s);
+    Write("flat.png", start + "\0\0\0\1\0\0\0\0"s);
+    EXPECT_FALSE(CheckEmptyError(RunOnFolder()).Has("Animation"));
+    Write("huge.png", start + "\xFF\xFF\xFF\xFF\0\0\0\1"s);
+    EXPECT_TRUE(CheckEmptyError(RunOnFolder()).Has("Animation of huge.png"));
+}
+
 TEST_F(Demo, CourseChecksAllHold) {
     Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
     EXPECT_EQ(outcome.Row("pieces unchanged by UTF-8"), "pieces unchanged by UTF-8 and back 6 of 6");

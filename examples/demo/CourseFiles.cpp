@@ -106,7 +106,7 @@ class Walk {
 
 CourseFolder FindCourseFiles(KTPath const &folder) { return Walk(folder).Run(); }
 
-std::string DescribePicture(KTPath const &file) {
+PictureSize ReadPictureSize(KTPath const &file) {
     // byte   0  8 signature
     // byte   8  4 length and 4 type of the first chunk, "IHDR"
     // byte  16  4 width, 4 height, most significant byte first
@@ -114,18 +114,23 @@ std::string DescribePicture(KTPath const &file) {
     constexpr std::string_view kSignature = "\x89PNG\r\n\x1A\n";
     DiskBytes const start = DiskRead(file, kHeader);
     if (!start.problem.empty()) {
-        return start.problem;
+        return {0, 0, start.problem};
     }
     std::string_view const bytes = start.bytes;
     if (bytes.size() < kHeader || !bytes.starts_with(kSignature) || bytes.substr(12, 4) != "IHDR") {
-        return "not a PNG picture";
+        return {0, 0, "not a PNG picture"};
     }
     auto const number = [bytes](std::size_t at) {
         KTUInt32 value = 0;
         for (char const byte : bytes.substr(at, 4)) {
             value = (value << 8) | static_cast<unsigned char>(byte);
         }
-        return std::to_string(value);
+        return value;
     };
-    return number(16) + " x " + number(20);
+    return {number(16), number(20), ""};
+}
+
+std::string DescribePicture(KTPath const &file) {
+    PictureSize const size = ReadPictureSize(file);
+    return size.problem.empty() ? std::to_string(size.width) + " x " + std::to_string(size.height) : size.problem;
 }

@@ -33,5 +33,15 @@ struct CourseFolder {
 /// the walk ends whatever the tree looks like; it also ends after 100,000 files.
 CourseFolder FindCourseFiles(KTPath const &folder);
 
+/// The size of a picture in pixels.
+struct PictureSize {
+    KTUInt32 width = 0;
+    KTUInt32 height = 0;
+    std::string problem; ///< why the size is not known; else empty
+};
+
+/// The size that a PNG file tells.
+PictureSize ReadPictureSize(KTPath const &file);
+
 /// "WIDTH x HEIGHT" of a PNG file, or what is wrong with it.
 std::string DescribePicture(KTPath const &file);

@@ -1,6 +1,7 @@
 // main.cpp: ktdemo, a small host of the KTPublic library. It reads the text files of a course and shows what the library
 // makes of them; the capabilities follow one another in Run.
 
+#include "CourseAnimation.h"
 #include "CourseCopy.h"
 #include "CourseFiles.h"
 #include "Options.h"
@@ -60,6 +61,7 @@ int Run(Console const &console, Options const &options) {
     console.Print(ReportCaptions(results));
     console.Print(ReportDictionaries(results, limits));
     console.Print(ReportOtherFiles(folder, limits));
+    console.Print(ReportAnimation(folder));
     {
         CourseCopy const copy(path); // gone again before the run ends
         log.Step("copied to the session folder");

@@ -5,6 +5,7 @@
 #include "KTInterpolator.h"
 
 #include <algorithm>
+#include <cmath>
 #include <iterator>
 
 namespace {
@@ -32,7 +33,7 @@ float PositionBetween(long long frame, long long start, long long end) {
 long long WarpedFrame(int frame, int first, int last) {
     float const eased = KTInterpolator::Interpolate(0.0F, 1.0F, PositionBetween(frame, first, last));
     double const span = static_cast<double>(static_cast<long long>(last) - first);
-    return first + static_cast<long long>(static_cast<double>(eased) * span + 0.5);
+    return first + static_cast<long long>(std::trunc(static_cast<double>(eased) * span + 0.5));
 }
 
 } // namespace
