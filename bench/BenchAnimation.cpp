@@ -8,6 +8,7 @@
 #include "KTInterpolator.h"
 
 #include <algorithm>
+#include <cmath>
 #include <cstddef>
 #include <random>
 #include <vector>
@@ -57,7 +58,7 @@ KTTransform WalkTo(std::vector<KTKeyframe> const &keyframes, int frame) {
     int const first = keyframes.front().frame;
     int const span = keyframes.back().frame - first;
     float const eased = KTInterpolator::Interpolate(0.0F, 1.0F, PositionBetween(frame, first, first + span));
-    int const warped = first + static_cast<int>(static_cast<double>(eased) * span + 0.5);
+    int const warped = first + static_cast<int>(std::trunc(static_cast<double>(eased) * span + 0.5));
     float const local = PositionBetween(warped, keyframes[start].frame, keyframes[start + 1].frame);
     KTInterpolator::SetInterpolationMode(kKTInterpolationLinear);
     KTTransform const transform =
@@ -104,6 +105,7 @@ void AddWalk(Size const &size) {
 
 void AddAnimationBenchmarks() {
     DescribeGroup(kGroup, "KTAnimation::GetTransform beside a walk through the keyframes");
+    ExpectSpeed(kGroup, kWalk, 1.0);
     DescribeGrowthGroup(kGrowthGroup, "cost as the keyframes become more");
     for (Size const &size : kSizes) {
         AddLibrary(kGroup, size);

@@ -64,7 +64,7 @@ KTTransform WalkedTransform(std::vector<KTKeyframe> const &keyframes, int frame)
     int const span = keyframes.back().frame - first;
     float const global = Clamped(static_cast<float>(frame - first) / static_cast<float>(span));
     float const eased = KTInterpolator::Interpolate(0.0F, 1.0F, global);
-    int const warped = first + static_cast<int>(static_cast<double>(eased) * span + 0.5);
+    int const warped = first + static_cast<int>(std::trunc(static_cast<double>(eased) * span + 0.5));
     int const length = keyframes[k + 1].frame - keyframes[k].frame;
     float const local = Clamped(static_cast<float>(warped - keyframes[k].frame) / static_cast<float>(length));
     ScopedInterpolationMode const linear(kKTInterpolationLinear);

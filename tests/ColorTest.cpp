@@ -285,6 +285,7 @@ TEST(ColorStop, SortsByPositionWithNanLast) {
     }
     std::sort(stops.begin(), stops.end());
     std::vector<double> positions;
+    positions.reserve(stops.size());
     for (KTColorStop const &stop : stops) {
         positions.push_back(stop.position);
     }

@@ -36,10 +36,10 @@ KTRect::RefPoint Point(int value) { return static_cast<KTRect::RefPoint>(value);
 
 // What dragging a point of (0, 0, 10, 10) to a position leaves.
 struct Dragged {
-    KTRect::RefPoint point;
+    KTRect::RefPoint point = KTRect::kNoPoint;
     KTPoint to;
     KTRect rect;
-    int result;
+    int result = -1;
 };
 
 } // namespace
