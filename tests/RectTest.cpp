@@ -111,6 +111,9 @@ TEST(Point, AngleBetweenVectorsHasASign) {
     EXPECT_EQ(KTPoint(-5, 3).VectorAngle(KTPoint(0, 0)), 0);
     EXPECT_DOUBLE_EQ(KTPoint(kHuge, 0).VectorAngle(KTPoint(0, kHuge)), kPi / 2) << "no overflow";
     EXPECT_DOUBLE_EQ(KTPoint(1 / kHuge, 0).VectorAngle(KTPoint(0, 1 / kHuge)), kPi / 2) << "no underflow";
+    double const most = std::numeric_limits<double>::max();
+    EXPECT_EQ(KTPoint(most, most).VectorAngle(KTPoint(most, most)), 0) << "no overflow in sums either";
+    EXPECT_DOUBLE_EQ(KTPoint(most, most).VectorAngle(KTPoint(-most, most)), kPi / 2);
 }
 
 TEST(Point, RotatesAboutACentre) {
