@@ -3,6 +3,9 @@
 
 #pragma once
 
+#include "IKTReadWriteStream.h"
+#include "IKTStream.h"
+#include "IKTXferBytes.h"
 #include "KTAllocate.h"
 #include "KTAssert.h"
 #include "KTComBSTR.h"
