@@ -157,6 +157,8 @@ TEST(AbiLayoutTest, NumbersAreFixed) {
     EXPECT_EQ(1, static_cast<int>(kKTErrorFailed));
     EXPECT_EQ(28, static_cast<int>(kKTErrorFileNotFound));
     EXPECT_EQ(4U, sizeof(KTErrorCodeEnum));
+    EXPECT_EQ(0, static_cast<int>(kKTHashSHA256));
+    EXPECT_EQ(4U, sizeof(KTHashFunctionEnum));
     EXPECT_EQ(0, static_cast<int>(KTString::kKTEncodingBytes));
     EXPECT_EQ(1, static_cast<int>(KTString::kKTEncodingUTF8));
     EXPECT_EQ(4U, sizeof(KTString::KTCharEncodingType));
