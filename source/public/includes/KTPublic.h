@@ -13,6 +13,7 @@
 #include "IKTXferBytes.h"
 #include "KTAllocate.h"
 #include "KTAssert.h"
+#include "KTColor.h"
 #include "KTComBSTR.h"
 #include "KTDataProvider.h"
 #include "KTDataValidator.h"
