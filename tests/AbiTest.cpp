@@ -33,6 +33,7 @@ VTableRow const kTables[] = {
     VTableOf<KTLock>({"~"}),
     VTableOf<KTRecursiveLock>({"~"}),
     VTableOf<KTCondition>({"~"}),
+    VTableOf<KTScrapDataFlavor>({"~"}),
     VTableOf<KTInterProcessFileLock>({"~"}),
     VTableOf<IKTXferBytes>({"pure ~", "pure", "pure", "pure", "pure", "pure", "pure", "pure"}),
     VTableOf<MemXferBytes>({"~", "MemXferBytes::Read(void*, unsigned int)", "MemXferBytes::Write(void*, unsigned int)",
@@ -254,6 +255,7 @@ TEST(AbiTest, ObjectsPointToTheLibrarysTables) {
     KTFile const file;
     KTTime const time;
     KTDuration const duration;
+    KTScrapDataFlavor const flavor;
     EXPECT_EQ(ExportedTable<KTMutex>(), TableOfObject(&mutex));
     EXPECT_EQ(ExportedTable<KTRecursiveMutex>(), TableOfObject(&recursiveMutex));
     EXPECT_EQ(ExportedTable<KTLock>(), TableOfObject(&lock));
@@ -263,6 +265,7 @@ TEST(AbiTest, ObjectsPointToTheLibrarysTables) {
     EXPECT_EQ(ExportedTable<KTFile>(), TableOfObject(&file));
     EXPECT_EQ(ExportedTable<KTTime>(), TableOfObject(&time));
     EXPECT_EQ(ExportedTable<KTDuration>(), TableOfObject(&duration));
+    EXPECT_EQ(ExportedTable<KTScrapDataFlavor>(), TableOfObject(&flavor));
     EXPECT_EQ(ExportedTable<WKTLogger>(), TableOfObject(gKTLogger));
 }
 
@@ -281,6 +284,7 @@ TEST(AbiTest, DerivedDestructorsRunThroughTheFirstSlot) {
     ExpectDestructorFirst<KTFile>();
     ExpectDestructorFirst<KTTime>();
     ExpectDestructorFirst<KTDuration>();
+    ExpectDestructorFirst<KTScrapDataFlavor>();
     ExpectDestructorFirst<KTMutex>();
     ExpectDestructorFirst<KTRecursiveMutex>();
     ExpectDestructorFirst<KTLock>(mutex);
