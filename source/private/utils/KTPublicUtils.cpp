@@ -2,6 +2,7 @@
 
 #include "KTPublicUtils.h"
 
+#include "IKTStream.h"
 #include "KTAssert.h"
 #include "KTBase64.h"
 #include "KTHttpDate.h"
@@ -12,6 +13,7 @@
 #include <atomic>
 #include <cstdlib>
 #include <ctime>
+#include <memory>
 #include <sstream>
 #include <string_view>
 
@@ -49,6 +51,27 @@ KTString PrintDigestOf(void const *bytes, std::size_t size) {
     return PrintDigest(digest);
 }
 
+// How a stream is read. Parts of at least this size, a multiple of a file transport's own 64 KiB, are read straight into
+// the buffer; smaller ones in a row would set off the transport's read-ahead, which leaves it in another state than one
+// read of everything does. So the last part takes what is left over.
+constexpr unsigned int kPart = 0x40000;
+
+unsigned int NextPart(unsigned int left) { return left >= 2 * kPart ? kPart : left; }
+
+// Digests the `size` bytes that follow in the stream. False if there are fewer.
+bool AddStream(IKTStream &stream, unsigned int size, ODigest &digest) {
+    auto const buffer = std::make_unique_for_overwrite<unsigned char[]>(std::min(size, 2 * kPart));
+    while (size != 0) {
+        unsigned int const part = NextPart(size);
+        if (stream.XferByte(buffer.get(), static_cast<int>(part)) != static_cast<int>(part)) {
+            return false;
+        }
+        digest.Add(buffer.get(), part);
+        size -= part;
+    }
+    return true;
+}
+
 using KeyBlock = std::array<unsigned char, kOShaBlock>;
 
 // SHA-1 of the key block, each byte changed by `pad`, and then the bytes.
@@ -65,6 +88,25 @@ void DigestPadded(KeyBlock const &key, unsigned char pad, void const *bytes, std
 } // namespace
 
 // ---- digests ----
+
+KTString KTPublicUtils::GenerateHash(IKTStream *stream, KTHashFunctionEnum const &function) {
+    if (stream == nullptr || stream->GetStreamState() != kKTStreamStateGood || stream->IsReading() == 0) {
+        Report("Generate Hash - not valid stream", 71);
+        return {};
+    }
+    stream->Seek(0, kKTSeekFromEnd);
+    if (!IsKnown(function)) {
+        return {};
+    }
+    unsigned int const size = stream->Tell();
+    stream->Seek(0, kKTSeekFromBeginning);
+    ODigest digest(ODigestKind::Sha256);
+    if (!AddStream(*stream, size, digest)) {
+        Report("Generate Hash - not valid stream", 88);
+        return {};
+    }
+    return PrintDigest(digest);
+}
 
 KTString KTPublicUtils::GenerateHash(KTString const &text, KTHashFunctionEnum const &function) {
     if (!IsKnown(function)) {

@@ -14,6 +14,8 @@
 
 #include "KTBeginExports.h"
 
+class IKTStream;
+
 /// The functions that GenerateHash knows.
 enum KTHashFunctionEnum : int {
     kKTHashSHA256 = 0 ///< SHA-256: a digest of 32 bytes
@@ -28,9 +30,14 @@ class KT_PUBLIC_API KTPublicUtils {
 
     // ---- digests ----
 
-    /// The digest of the string's UTF-8 form, without a terminator, as lower-case hexadecimal (64 digits). A function
-    /// other than kKTHashSHA256 is reported as the assertion "Algorithm - Hashing not implemented" and gives an empty
-    /// string.
+    /// The digest of everything in the stream, from its beginning to its end, as lower-case hexadecimal (64 digits).
+    /// Needs at most 512 KiB of memory whatever the stream's size, and leaves the stream at its end. A stream that is
+    /// null, not in good state or not reading is reported as the assertion "Generate Hash - not valid stream" and gives
+    /// an empty string; so does a stream that ends before its size. A function other than kKTHashSHA256 is reported as
+    /// "Algorithm - Hashing not implemented" and gives an empty string. One thread at a time for each stream.
+    static KTString GenerateHash(IKTStream *stream, KTHashFunctionEnum const &function);
+
+    /// The digest of the string's UTF-8 form, without a terminator, printed the same way; functions as above.
     static KTString GenerateHash(KTString const &text, KTHashFunctionEnum const &function);
 
     /// The digest of `length` bytes, printed the same way. Null bytes are reported as "GenerateHash bytes NULL" and
