@@ -70,5 +70,6 @@ void AddLoggerBenchmarks();
 void AddLockBenchmarks();
 void AddGrowthBenchmarks();
 void AddFileBenchmarks();
+void AddDigestBenchmarks();
 
 } // namespace bench

@@ -51,6 +51,7 @@ int main(int argc, char **argv) {
     bench::AddLockBenchmarks();
     bench::AddGrowthBenchmarks();
     bench::AddFileBenchmarks();
+    bench::AddDigestBenchmarks();
 
     bench::Report report;
     if (benchmark::RunSpecifiedBenchmarks(&report) == 0) {

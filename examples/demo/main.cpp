@@ -2,7 +2,9 @@
 // makes of them; the capabilities follow one another in Run.
 
 #include "CourseCopy.h"
+#include "CourseDigests.h"
 #include "CourseFiles.h"
+#include "CourseProperties.h"
 #include "Options.h"
 #include "ReadCourse.h"
 #include "Report.h"
@@ -59,7 +61,9 @@ int Run(Console const &console, Options const &options) {
     console.Print(ReportTexts(results, limits));
     console.Print(ReportCaptions(results));
     console.Print(ReportDictionaries(results, limits));
+    console.Print(ReportProperties(folder, limits));
     console.Print(ReportOtherFiles(folder, limits));
+    console.Print(ReportDigests(folder, limits));
     {
         CourseCopy const copy(path); // gone again before the run ends
         log.Step("copied to the session folder");

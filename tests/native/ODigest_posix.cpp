@@ -11,6 +11,8 @@ namespace {
 
 using Word = std::uint32_t;
 
+constexpr std::size_t kSha1Words = kOSha1Size / sizeof(Word);
+
 constexpr std::array<Word, 64> kSha256Words = {
     0x428a2f98, 0x71374491, 0xb5c0fbcf, 0xe9b5dba5, 0x3956c25b, 0x59f111f1, 0x923f82a4, 0xab1c5ed5,
     0xd807aa98, 0x12835b01, 0x243185be, 0x550c7dc3, 0x72be5d74, 0x80deb1fe, 0x9bdc06a7, 0xc19bf174,
@@ -86,13 +88,13 @@ void Sha256Block(std::vector<Word> &hash, unsigned char const *block) {
 } // namespace
 
 struct ODigest::State {
-    ODigestKind kind;
     std::vector<Word> hash;
     std::vector<unsigned char> rest; // less than a block
     std::uint64_t bits = 0;
 
+    // The digests' states have different sizes.
     void Block(unsigned char const *block) {
-        if (kind == ODigestKind::Sha1) {
+        if (hash.size() == kSha1Words) {
             Sha1Block(hash, block);
         } else {
             Sha256Block(hash, block);
@@ -100,8 +102,9 @@ struct ODigest::State {
     }
 };
 
-ODigest::ODigest(ODigestKind kind) : m_State(std::make_unique<State>()) {
-    m_State->kind = kind;
+void ODigest::DeleteState::operator()(State *state) const noexcept { delete state; }
+
+ODigest::ODigest(ODigestKind kind) : m_Kind(kind), m_State(new State) {
     if (kind == ODigestKind::Sha1) {
         m_State->hash = {0x67452301, 0xefcdab89, 0x98badcfe, 0x10325476, 0xc3d2e1f0};
     } else {
@@ -109,8 +112,6 @@ ODigest::ODigest(ODigestKind kind) : m_State(std::make_unique<State>()) {
                          0x510e527f, 0x9b05688c, 0x1f83d9ab, 0x5be0cd19};
     }
 }
-
-ODigest::~ODigest() = default;
 
 void ODigest::Add(void const *bytes, std::size_t size) {
     auto const *next = static_cast<unsigned char const *>(bytes);

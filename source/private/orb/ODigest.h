@@ -24,9 +24,6 @@ inline constexpr std::size_t kOShaBlock = 64;   // bytes that both digest at a t
 class ODigest {
   public:
     explicit ODigest(ODigestKind kind);
-    ODigest(ODigest const &) = delete;
-    ODigest &operator=(ODigest const &) = delete;
-    ~ODigest();
 
     /// Takes the next bytes of the message. `bytes` may be null when `size` is 0.
     void Add(void const *bytes, std::size_t size);
@@ -35,7 +32,11 @@ class ODigest {
     void Finish(unsigned char *digest);
 
   private:
-    struct State;
+    struct State; // what the system keeps; on Windows its handle stands for the address
+    struct DeleteState {
+        void operator()(State *state) const noexcept;
+    };
 
-    std::unique_ptr<State> m_State;
+    ODigestKind m_Kind;
+    std::unique_ptr<State, DeleteState> m_State;
 };

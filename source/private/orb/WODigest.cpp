@@ -32,28 +32,16 @@ void Require(NTSTATUS status) {
     }
 }
 
-struct DestroyHash {
-    using pointer = BCRYPT_HASH_HANDLE;
-    void operator()(BCRYPT_HASH_HANDLE hash) const noexcept { BCryptDestroyHash(hash); }
-};
-
 } // namespace
 
-struct ODigest::State {
-    std::unique_ptr<BCRYPT_HASH_HANDLE, DestroyHash> hash;
-    ULONG size = 0;
-};
+void ODigest::DeleteState::operator()(State *state) const noexcept { BCryptDestroyHash(state); }
 
-ODigest::ODigest(ODigestKind kind) : m_State(std::make_unique<State>()) {
-    bool const isSha1 = kind == ODigestKind::Sha1;
-    auto *const algorithm = reinterpret_cast<BCRYPT_ALG_HANDLE>(isSha1 ? kSha1 : kSha256);
+ODigest::ODigest(ODigestKind kind) : m_Kind(kind) {
+    auto *const algorithm = reinterpret_cast<BCRYPT_ALG_HANDLE>(kind == ODigestKind::Sha1 ? kSha1 : kSha256);
     BCRYPT_HASH_HANDLE hash = nullptr;
     Require(BCryptCreateHash(algorithm, &hash, nullptr, 0, nullptr, 0, 0));
-    m_State->hash.reset(hash);
-    m_State->size = isSha1 ? kOSha1Size : kOSha256Size;
+    m_State.reset(static_cast<State *>(hash));
 }
-
-ODigest::~ODigest() = default;
 
 void ODigest::Add(void const *bytes, std::size_t size) {
     // The system takes sizes of 32 bits, and its parameter is not constant although it only reads.
@@ -61,12 +49,13 @@ void ODigest::Add(void const *bytes, std::size_t size) {
     auto *next = static_cast<unsigned char *>(const_cast<void *>(bytes));
     while (size != 0) {
         std::size_t const part = std::min(size, kMost);
-        Require(BCryptHashData(m_State->hash.get(), next, static_cast<ULONG>(part), 0));
+        Require(BCryptHashData(m_State.get(), next, static_cast<ULONG>(part), 0));
         next += part;
         size -= part;
     }
 }
 
 void ODigest::Finish(unsigned char *digest) {
-    Require(BCryptFinishHash(m_State->hash.get(), digest, m_State->size, 0));
+    ULONG const size = m_Kind == ODigestKind::Sha1 ? kOSha1Size : kOSha256Size;
+    Require(BCryptFinishHash(m_State.get(), digest, size, 0));
 }

@@ -34,7 +34,8 @@ class KT_PUBLIC_API KTPublicUtils {
     /// Needs at most 512 KiB of memory whatever the stream's size, and leaves the stream at its end. A stream that is
     /// null, not in good state or not reading is reported as the assertion "Generate Hash - not valid stream" and gives
     /// an empty string; so does a stream that ends before its size. A function other than kKTHashSHA256 is reported as
-    /// "Algorithm - Hashing not implemented" and gives an empty string. One thread at a time for each stream.
+    /// "Algorithm - Hashing not implemented" and gives an empty string. REQUIRES: a stream of less than 4 GiB, as
+    /// positions in streams are. One thread at a time for each stream.
     static KTString GenerateHash(IKTStream *stream, KTHashFunctionEnum const &function);
 
     /// The digest of the string's UTF-8 form, without a terminator, printed the same way; functions as above.
