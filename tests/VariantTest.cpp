@@ -179,6 +179,10 @@ TEST(Variant, TextsInOtherFormsDoNotCompile) {
     EXPECT_FALSE((std::is_constructible_v<KTVariant, char *>));
     EXPECT_FALSE((std::is_constructible_v<KTVariant, wchar_t const *>));
     EXPECT_FALSE((std::is_constructible_v<KTVariant, unsigned short const *>));
+    EXPECT_FALSE((std::is_constructible_v<KTVariant, int const *>)) << "would be a bool";
+    EXPECT_FALSE((std::is_constructible_v<KTVariant, void const *>));
+    EXPECT_FALSE((std::is_constructible_v<KTVariant, long long>)) << "would be cut";
+    EXPECT_EQ(KTVariant(&theTarget).Type(), KTVariant::kVoidPtr);
     EXPECT_EQ(KTVariant(nullptr).Type(), KTVariant::kVoidPtr);
 }
 
@@ -292,6 +296,7 @@ TEST(Variant, EqualsItsCopyAndNothingElse) {
         }
     }
     EXPECT_TRUE((std::is_same_v<KTBool16, decltype(KTVariant() == KTVariant())>));
+    EXPECT_TRUE((std::is_same_v<KTBool16, decltype(KTVariant() != KTVariant())>));
 }
 
 TEST(Variant, CopiesOwnWhatTheyHold) {

@@ -11,8 +11,6 @@ namespace {
 
 using Word = std::uint32_t;
 
-constexpr std::size_t kSha1Words = kOSha1Size / sizeof(Word);
-
 constexpr std::array<Word, 64> kSha256Words = {
     0x428a2f98, 0x71374491, 0xb5c0fbcf, 0xe9b5dba5, 0x3956c25b, 0x59f111f1, 0x923f82a4, 0xab1c5ed5,
     0xd807aa98, 0x12835b01, 0x243185be, 0x550c7dc3, 0x72be5d74, 0x80deb1fe, 0x9bdc06a7, 0xc19bf174,
@@ -92,9 +90,8 @@ struct ODigest::State {
     std::vector<unsigned char> rest; // less than a block
     std::uint64_t bits = 0;
 
-    // The digests' states have different sizes.
-    void Block(unsigned char const *block) {
-        if (hash.size() == kSha1Words) {
+    void Block(ODigestKind kind, unsigned char const *block) {
+        if (kind == ODigestKind::Sha1) {
             Sha1Block(hash, block);
         } else {
             Sha256Block(hash, block);
@@ -118,14 +115,14 @@ void ODigest::Add(void const *bytes, std::size_t size) {
     m_State->bits += std::uint64_t{size} * 8;
     for (; size != 0; --size) {
         if (m_State->rest.empty() && size >= kOShaBlock) {
-            m_State->Block(next);
+            m_State->Block(m_Kind, next);
             next += kOShaBlock;
             size -= kOShaBlock - 1;
             continue;
         }
         m_State->rest.push_back(*next++);
         if (m_State->rest.size() == kOShaBlock) {
-            m_State->Block(m_State->rest.data());
+            m_State->Block(m_Kind, m_State->rest.data());
             m_State->rest.clear();
         }
     }

@@ -38,9 +38,9 @@ KTString PrintDigest(ODigest &digest) {
     std::array<unsigned short, 2 * kOSha256Size + 1> units{};
     auto *next = units.data();
     for (unsigned char const byte : bytes) {
-        constexpr std::string_view kDigits = "0123456789abcdef";
-        *next++ = static_cast<unsigned short>(kDigits[byte >> 4]);
-        *next++ = static_cast<unsigned short>(kDigits[byte & 15]);
+        constexpr std::u16string_view kDigits = u"0123456789abcdef";
+        *next++ = kDigits[byte >> 4];
+        *next++ = kDigits[byte & 15];
     }
     return KTString(units.data());
 }

@@ -16,7 +16,7 @@
 // Maps nest as deep as memory allows: copying, comparing and destroying take a fixed amount of stack. Copies copy all
 // that is in a map, so a map that is no longer needed is better moved: `course.SetObject(std::move(page))`.
 //
-// WRONG: KTVariant("text"). Byte and wide texts do not compile, as the language would make a bool of them.
+// WRONG: KTVariant("text"). Byte and wide texts do not compile, as the language would make a bool or an address of them.
 //
 // Threads: different variants may be used on different threads; one variant is not locked. Reading one from several
 // threads at a time is safe while none changes it. Setters, copies and comparisons throw std::bad_alloc when memory is
@@ -33,6 +33,7 @@
 #include <concepts>
 #include <map>
 #include <memory>
+#include <type_traits>
 
 #include "KTBeginExports.h"
 
@@ -73,10 +74,12 @@ class KT_PUBLIC_API KTVariant {
     KTVariant(KTColor const &value);
     KTVariant(KTShortCut const &value);
 
-    /// Texts in other forms: say KTVariant(KTString("text")).
+    /// Texts in other forms, for which KTVariant(KTString("text")) is meant, and pointers to constants, which would
+    /// become a bool.
     template <typename T>
-        requires std::same_as<T, char> || std::same_as<T, wchar_t> || std::same_as<T, unsigned short>
-    KTVariant(T const *) = delete;
+        requires std::is_const_v<T> || std::same_as<T, char> || std::same_as<T, wchar_t> ||
+                     std::same_as<T, unsigned short>
+    KTVariant(T *) = delete;
 
     /// Copies all values, those of other kinds than the tag's too.
     KTVariant(KTVariant const &other);
