@@ -22,7 +22,7 @@ std::time_t Seconds(std::string const &date) {
         std::chrono::year(number(12, 4)) / static_cast<int>(months.find(date.substr(8, 3)) / 3 + 1) / number(5, 2);
     std::chrono::sys_days const days(day);
     std::string const weekdays = "SunMonTueWedThuFriSat";
-    EXPECT_EQ(weekdays.substr(3 * std::chrono::weekday(days).c_encoding(), 3), date.substr(0, 3));
+    EXPECT_EQ(weekdays.substr(std::size_t{3} * std::chrono::weekday(days).c_encoding(), 3), date.substr(0, 3));
     EXPECT_EQ(date.substr(3, 2) + date[7] + date[11] + date[16] + date[19] + date[22] + date.substr(25), ",    :: GMT");
     auto const time = days + std::chrono::hours(number(17, 2)) + std::chrono::minutes(number(20, 2)) +
                       std::chrono::seconds(number(23, 2));

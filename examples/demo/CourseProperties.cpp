@@ -110,7 +110,8 @@ std::string ReportValues(KTVariant const &course, ReportLimits const &limits) {
             }
         }
     }
-    KTVariant const copy(course);
+    KTVariant copy;
+    copy = course;
     return "Properties\n" + table.Print() + More(count, limits.rows) +
            "  a copy is equal: " + (copy == course ? "yes" : "no") + "\n\n";
 }

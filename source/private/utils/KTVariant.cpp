@@ -82,7 +82,10 @@ KTVariant::OwnedChildren KTVariant::Take(Map &&map) {
 
 KTVariant::Map const &KTVariant::EntriesOf(OwnedChildren const &children) {
     static Map const empty;
-    return children != nullptr ? children->entries : empty;
+    if (children == nullptr) {
+        return empty;
+    }
+    return children->entries;
 }
 
 // ---- construction ----
