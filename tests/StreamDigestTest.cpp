@@ -58,8 +58,8 @@ class TemporaryFile {
     }
 
     std::unique_ptr<IKTStream> Open() const {
-        return std::unique_ptr<IKTStream>(
-            KTStreamUtil::CreateFileStreamRead(KTFile(KTString(m_Path.wstring().c_str())), FileXferBytes::kOpenRead, 0, 0));
+        return std::unique_ptr<IKTStream>(KTStreamUtil::CreateFileStreamRead(KTFile(KTString(m_Path.wstring().c_str())),
+                                                                             FileXferBytes::kOpenRead, 0, 0));
     }
 
   private:
