@@ -71,5 +71,6 @@ void AddLockBenchmarks();
 void AddGrowthBenchmarks();
 void AddFileBenchmarks();
 void AddAnimationBenchmarks();
+void AddDigestBenchmarks();
 
 } // namespace bench

@@ -52,6 +52,7 @@ int main(int argc, char **argv) {
     bench::AddGrowthBenchmarks();
     bench::AddFileBenchmarks();
     bench::AddAnimationBenchmarks();
+    bench::AddDigestBenchmarks();
 
     bench::Report report;
     if (benchmark::RunSpecifiedBenchmarks(&report) == 0) {

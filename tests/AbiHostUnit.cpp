@@ -37,6 +37,9 @@ std::string ktabi::KT_HOST_FUNCTION() {
     bool const refused = KTFileUtil::CreateDirectoryW(KTPath()) != KTFileUtil::kErrorNone &&
                          KTFileUtil::MoveFileW(KTFile(), KTFile()) != KTFileUtil::kErrorNone &&
                          !file.CanOpen(KTFile::kAccessRead, KTFile::kShareAll);
+    KTVariant variant;
+    variant.SetObject({{KTString("key"), KTVariant(3)}});
+    bool const found = variant.GetObject().at("key").GetInt() == 3 && GetObject(nullptr, 0, nullptr) == 0;
     Deallocate(Allocate(10));
     gKTLogger->Log("host unit %d", 1);
     gKTLogger->Log(std::wstring(L"host unit"));
@@ -44,6 +47,7 @@ std::string ktabi::KT_HOST_FUNCTION() {
     std::size_t const largest = (std::numeric_limits<std::size_t>::max)();
     // The system's own names still mean the system's functions.
     bool const running = GetModuleHandle(nullptr) != nullptr && GetTickCount64() != 0;
-    return text.GetUTF8String() + (woken || !running || !refused || largest != KTString::npos ? " wrong" : " right") +
+    return text.GetUTF8String() +
+           (woken || !running || !refused || !found || largest != KTString::npos ? " wrong" : " right") +
            (temporary == KTFile() ? " nowhere" : "") + KTPublicUtils::ConstructLogStr(" v", 1.5F);
 }

@@ -228,6 +228,12 @@ TEST(AbiLayoutTest, NumbersAreFixed) {
     EXPECT_EQ(1, static_cast<int>(kKTErrorFailed));
     EXPECT_EQ(28, static_cast<int>(kKTErrorFileNotFound));
     EXPECT_EQ(4U, sizeof(KTErrorCodeEnum));
+    EXPECT_EQ(0, static_cast<int>(kKTHashSHA256));
+    EXPECT_EQ(4U, sizeof(KTHashFunctionEnum));
+    EXPECT_EQ(4U, sizeof(KTVariant::KTVariantType));
+    EXPECT_EQ(4U, sizeof(KTShortCutModifiers));
+    EXPECT_EQ(4U, sizeof(KTShortCutKey));
+    EXPECT_EQ(8U, sizeof(KTShortCut));
     EXPECT_EQ(0, static_cast<int>(KTString::kKTEncodingBytes));
     EXPECT_EQ(1, static_cast<int>(KTString::kKTEncodingUTF8));
     EXPECT_EQ(4U, sizeof(KTString::KTCharEncodingType));

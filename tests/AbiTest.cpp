@@ -42,7 +42,158 @@ VTableRow const kTables[] = {
     VTableOf<KTLock>({"~"}),
     VTableOf<KTRecursiveLock>({"~"}),
     VTableOf<KTCondition>({"~"}),
+    VTableOf<KTScrapDataFlavor>({"~"}),
     VTableOf<KTInterProcessFileLock>({"~"}),
+    VTableOf<IKTXferBytes>({"pure ~", "pure", "pure", "pure", "pure", "pure", "pure", "pure"}),
+    VTableOf<MemXferBytes>({"~", "MemXferBytes::Read(void*, unsigned int)", "MemXferBytes::Write(void*, unsigned int)",
+                            "MemXferBytes::Seek(int, KTSeekFromWhere)", "MemXferBytes::Tell()", "MemXferBytes::Flush()",
+                            "MemXferBytes::GetStreamState()", "MemXferBytes::SetEndOfStream()"}),
+    VTableOf<FileXferBytes>(
+        {"~", "FileXferBytes::Read(void*, unsigned int)", "FileXferBytes::Write(void*, unsigned int)",
+         "FileXferBytes::Seek(int, KTSeekFromWhere)", "FileXferBytes::Tell()", "FileXferBytes::Flush()",
+         "FileXferBytes::GetStreamState()", "FileXferBytes::SetEndOfStream()",
+         "FileXferBytes::Open(KTFile const&, unsigned int, unsigned int, unsigned int)", "FileXferBytes::Close()"}),
+    VTableOf<TempFileXferBytes>(
+        {"~", "FileXferBytes::Read(void*, unsigned int)", "FileXferBytes::Write(void*, unsigned int)",
+         "FileXferBytes::Seek(int, KTSeekFromWhere)", "FileXferBytes::Tell()", "FileXferBytes::Flush()",
+         "FileXferBytes::GetStreamState()", "FileXferBytes::SetEndOfStream()",
+         "FileXferBytes::Open(KTFile const&, unsigned int, unsigned int, unsigned int)", "FileXferBytes::Close()"}),
+    VTableOf<IKTStream>({"pure ~", "pure", "pure", "pure", "pure", "pure", "pure", "pure", "pure", "pure",
+                         "pure",   "pure", "pure", "pure", "pure", "pure", "pure", "pure", "pure", "pure",
+                         "pure",   "pure", "pure", "pure", "pure", "pure", "pure", "pure", "pure"}),
+    VTableOf<CKTStreamRead>({"~",
+                             "CKTStreamRead::XferByte(unsigned char*, int)",
+                             "CKTStreamRead::XferByte(unsigned char&)",
+                             "CKTStreamRead::XferString(KTString&, bool, bool)",
+                             "CKTStreamRead::XferBool(short*, int)",
+                             "CKTStreamRead::XferBool(short&)",
+                             "CKTStreamRead::XferInt16(short*, int)",
+                             "CKTStreamRead::XferInt16(short&)",
+                             "CKTStreamRead::XferInt32(int*, int)",
+                             "CKTStreamRead::XferInt32(int&)",
+                             "CKTStreamRead::XferInt64(long long&)",
+                             "CKTStreamRead::XferID(int*, int)",
+                             "CKTStreamRead::XferID(int&)",
+                             "CKTStreamRead::XferPropertyID(int*, int)",
+                             "CKTStreamRead::XferPropertyID(int&)",
+                             "CKTStreamRead::XferRealNumber(KTReal*, int)",
+                             "CKTStreamRead::XferRealNumber(KTReal&)",
+                             "CKTStreamRead::Comment(char*)",
+                             "CKTStreamRead::Seek(int, KTSeekFromWhere)",
+                             "CKTStreamRead::Tell()",
+                             "CKTStreamRead::SetEndOfStream()",
+                             "CKTStreamRead::Flush()",
+                             "CKTStreamRead::GetStreamState()",
+                             "CKTStreamRead::IsReading() const",
+                             "CKTStreamRead::IsWriting() const",
+                             "CKTStreamRead::SetSwapping(short)",
+                             "CKTStreamRead::GetSwapping() const",
+                             "CKTStreamRead::Open()",
+                             "CKTStreamRead::Close()"}),
+    VTableOf<CKTStreamWrite>({"~",
+                              "CKTStreamWrite::XferByte(unsigned char*, int)",
+                              "CKTStreamWrite::XferByte(unsigned char&)",
+                              "CKTStreamWrite::XferString(KTString&, bool, bool)",
+                              "CKTStreamWrite::XferBool(short*, int)",
+                              "CKTStreamWrite::XferBool(short&)",
+                              "CKTStreamWrite::XferInt16(short*, int)",
+                              "CKTStreamWrite::XferInt16(short&)",
+                              "CKTStreamWrite::XferInt32(int*, int)",
+                              "CKTStreamWrite::XferInt32(int&)",
+                              "CKTStreamWrite::XferInt64(long long&)",
+                              "CKTStreamWrite::XferID(int*, int)",
+                              "CKTStreamWrite::XferID(int&)",
+                              "CKTStreamWrite::XferPropertyID(int*, int)",
+                              "CKTStreamWrite::XferPropertyID(int&)",
+                              "CKTStreamWrite::XferRealNumber(KTReal*, int)",
+                              "CKTStreamWrite::XferRealNumber(KTReal&)",
+                              "CKTStreamWrite::Comment(char*)",
+                              "CKTStreamWrite::Seek(int, KTSeekFromWhere)",
+                              "CKTStreamWrite::Tell()",
+                              "CKTStreamWrite::SetEndOfStream()",
+                              "CKTStreamWrite::Flush()",
+                              "CKTStreamWrite::GetStreamState()",
+                              "CKTStreamWrite::IsReading() const",
+                              "CKTStreamWrite::IsWriting() const",
+                              "CKTStreamWrite::SetSwapping(short)",
+                              "CKTStreamWrite::GetSwapping() const",
+                              "CKTStreamWrite::Open()",
+                              "CKTStreamWrite::Close()"}),
+    VTableOf<IKTReadWriteStream>({"pure ~", "pure", "pure", "pure", "pure", "pure", "pure", "pure",
+                                  "pure",   "pure", "pure", "pure", "pure", "pure", "pure", "pure",
+                                  "pure",   "pure", "pure", "pure", "pure", "pure", "pure", "pure",
+                                  "pure",   "pure", "pure", "pure", "pure", "pure", "pure"}),
+    VTableOf<CKTStreamReadWrite>({"~",
+                                  "CKTStreamReadWrite::XferByte(unsigned char*, int)",
+                                  "CKTStreamReadWrite::XferByte(unsigned char&)",
+                                  "CKTStreamReadWrite::XferString(KTString&, bool, bool)",
+                                  "CKTStreamReadWrite::XferBool(short*, int)",
+                                  "CKTStreamReadWrite::XferBool(short&)",
+                                  "CKTStreamReadWrite::XferInt16(short*, int)",
+                                  "CKTStreamReadWrite::XferInt16(short&)",
+                                  "CKTStreamReadWrite::XferInt32(int*, int)",
+                                  "CKTStreamReadWrite::XferInt32(int&)",
+                                  "CKTStreamReadWrite::XferInt64(long long&)",
+                                  "CKTStreamReadWrite::XferID(int*, int)",
+                                  "CKTStreamReadWrite::XferID(int&)",
+                                  "CKTStreamReadWrite::XferPropertyID(int*, int)",
+                                  "CKTStreamReadWrite::XferPropertyID(int&)",
+                                  "CKTStreamReadWrite::XferRealNumber(KTReal*, int)",
+                                  "CKTStreamReadWrite::XferRealNumber(KTReal&)",
+                                  "CKTStreamReadWrite::Comment(char*)",
+                                  "CKTStreamReadWrite::Seek(int, KTSeekFromWhere)",
+                                  "CKTStreamReadWrite::Tell()",
+                                  "CKTStreamReadWrite::SetEndOfStream()",
+                                  "CKTStreamReadWrite::Flush()",
+                                  "CKTStreamReadWrite::GetStreamState()",
+                                  "CKTStreamReadWrite::IsReading() const",
+                                  "CKTStreamReadWrite::IsWriting() const",
+                                  "CKTStreamReadWrite::SetSwapping(short)",
+                                  "CKTStreamReadWrite::GetSwapping() const",
+                                  "CKTStreamReadWrite::Open()",
+                                  "CKTStreamReadWrite::Close()",
+                                  "CKTStreamReadWrite::SetMode(IKTReadWriteStream::Mode)",
+                                  "CKTStreamReadWrite::GetMode() const",
+                                  "CKTStreamReadWrite::Destroy()"}),
+    VTableOf<CKTTempFileStreamReadWrite>({"~",
+                                          "CKTStreamReadWrite::XferByte(unsigned char*, int)",
+                                          "CKTStreamReadWrite::XferByte(unsigned char&)",
+                                          "CKTStreamReadWrite::XferString(KTString&, bool, bool)",
+                                          "CKTStreamReadWrite::XferBool(short*, int)",
+                                          "CKTStreamReadWrite::XferBool(short&)",
+                                          "CKTStreamReadWrite::XferInt16(short*, int)",
+                                          "CKTStreamReadWrite::XferInt16(short&)",
+                                          "CKTStreamReadWrite::XferInt32(int*, int)",
+                                          "CKTStreamReadWrite::XferInt32(int&)",
+                                          "CKTStreamReadWrite::XferInt64(long long&)",
+                                          "CKTStreamReadWrite::XferID(int*, int)",
+                                          "CKTStreamReadWrite::XferID(int&)",
+                                          "CKTStreamReadWrite::XferPropertyID(int*, int)",
+                                          "CKTStreamReadWrite::XferPropertyID(int&)",
+                                          "CKTStreamReadWrite::XferRealNumber(KTReal*, int)",
+                                          "CKTStreamReadWrite::XferRealNumber(KTReal&)",
+                                          "CKTStreamReadWrite::Comment(char*)",
+                                          "CKTStreamReadWrite::Seek(int, KTSeekFromWhere)",
+                                          "CKTStreamReadWrite::Tell()",
+                                          "CKTStreamReadWrite::SetEndOfStream()",
+                                          "CKTStreamReadWrite::Flush()",
+                                          "CKTStreamReadWrite::GetStreamState()",
+                                          "CKTStreamReadWrite::IsReading() const",
+                                          "CKTStreamReadWrite::IsWriting() const",
+                                          "CKTStreamReadWrite::SetSwapping(short)",
+                                          "CKTStreamReadWrite::GetSwapping() const",
+                                          "CKTStreamReadWrite::Open()",
+                                          "CKTStreamReadWrite::Close()",
+                                          "CKTStreamReadWrite::SetMode(IKTReadWriteStream::Mode)",
+                                          "CKTStreamReadWrite::GetMode() const",
+                                          "CKTStreamReadWrite::Destroy()"}),
+    VTableOf<IKTDataProvider>({"pure ~", "pure", "pure", "pure"}),
+    VTableOf<KTMemoryDataProvider>(
+        {"~", "KTMemoryDataProvider::GetDataSize() const",
+         "KTMemoryDataProvider::GetNextData(unsigned long long, void**, unsigned long long&)",
+         "KTMemoryDataProvider::FreeDataMemory(void*)"}),
+    VTableOf<IKTGeneralProgressCallBack>(
+        {"pure ~", "pure", "pure", "pure", "pure", "pure", "pure", "pure", "pure", "pure", "pure", "pure"}),
 };
 
 constexpr std::size_t kCompleteDestructor = 0; // entries of a class whose first slot is its destructor
@@ -113,6 +264,7 @@ TEST(AbiTest, ObjectsPointToTheLibrarysTables) {
     KTFile const file;
     KTTime const time;
     KTDuration const duration;
+    KTScrapDataFlavor const flavor;
     EXPECT_EQ(ExportedTable<KTMutex>(), TableOfObject(&mutex));
     EXPECT_EQ(ExportedTable<KTRecursiveMutex>(), TableOfObject(&recursiveMutex));
     EXPECT_EQ(ExportedTable<KTLock>(), TableOfObject(&lock));
@@ -122,6 +274,7 @@ TEST(AbiTest, ObjectsPointToTheLibrarysTables) {
     EXPECT_EQ(ExportedTable<KTFile>(), TableOfObject(&file));
     EXPECT_EQ(ExportedTable<KTTime>(), TableOfObject(&time));
     EXPECT_EQ(ExportedTable<KTDuration>(), TableOfObject(&duration));
+    EXPECT_EQ(ExportedTable<KTScrapDataFlavor>(), TableOfObject(&flavor));
     EXPECT_EQ(ExportedTable<WKTLogger>(), TableOfObject(gKTLogger));
 }
 
@@ -141,11 +294,21 @@ TEST(AbiTest, DerivedDestructorsRunThroughTheFirstSlot) {
     ExpectDestructorFirst<KTTime>();
     ExpectDestructorFirst<KTDuration>();
     ExpectDestructorFirst<KTColor>();
+    ExpectDestructorFirst<KTScrapDataFlavor>();
     ExpectDestructorFirst<KTMutex>();
     ExpectDestructorFirst<KTRecursiveMutex>();
     ExpectDestructorFirst<KTLock>(mutex);
     ExpectDestructorFirst<KTRecursiveLock>(recursiveMutex);
     ExpectDestructorFirst<KTCondition>();
+    ExpectDestructorFirst<MemXferBytes>();
+    ExpectDestructorFirst<FileXferBytes>();
+    ExpectDestructorFirst<TempFileXferBytes>();
+    ExpectDestructorFirst<CKTStreamRead>();
+    ExpectDestructorFirst<CKTStreamWrite>();
+    ExpectDestructorFirst<CKTStreamReadWrite>();
+    ExpectDestructorFirst<CKTTempFileStreamReadWrite>();
+    int data = 0;
+    ExpectDestructorFirst<KTMemoryDataProvider>(static_cast<void *>(&data), 4ULL);
 
     std::wstring const lockedFile = gKTLogger->GetLogFilePath().GetPathAsKTString().GetWstring();
     ExpectDestructorFirst<KTInterProcessFileLock>(KTString(lockedFile.c_str()));

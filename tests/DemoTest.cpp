@@ -153,7 +153,7 @@ TEST_F(Demo, CourseTextsAreCountedExactly) {
     Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
     EXPECT_EQ(outcome.status, 0U);
     EXPECT_EQ(outcome.Row("File"), "File Encoding Bytes Units Lines Words Non-ASCII U+FFFD Notes");
-    EXPECT_EQ(outcome.Row("settings.ini"), "settings.ini UTF-8 746 745 32 93 1 0");
+    EXPECT_EQ(outcome.Row("settings.ini"), "settings.ini UTF-8 1027 1026 42 124 1 0");
     EXPECT_EQ(outcome.Row("captions/intro.bytes.txt"), "captions/intro.bytes.txt bytes 523 523 8 86 6 0");
     EXPECT_EQ(outcome.Row("captions/intro.utf16.txt"), "captions/intro.utf16.txt UTF-16 LE 1048 523 8 102 7 0");
     EXPECT_EQ(outcome.Row("strings/en_US.txt"), "strings/en_US.txt UTF-16 LE 1772 885 19 89 34 0");
@@ -215,6 +215,62 @@ TEST_F(Demo, WithoutAReadablePictureNothingIsAnimated) {
     EXPECT_TRUE(CheckEmptyError(RunOnFolder()).Has("Animation of huge.png"));
 }
 
+TEST_F(Demo, CourseSettingsBecomeTypedProperties) {
+    Outcome outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
+    outcome.out.erase(0, std::min(outcome.out.find("Properties\n"), outcome.out.size()));
+    EXPECT_EQ(outcome.Row("Section"), "Section Property Kind Value");
+    EXPECT_TRUE(outcome.Has("\n  Course     Author         string     Nora Hellström\n")) << outcome.out;
+    EXPECT_TRUE(outcome.Has("\n  Course     Version        string     1.4.2\n"));
+    EXPECT_TRUE(outcome.Has("\n  Player     AccentColour   colour     #1F6FA8\n"));
+    EXPECT_TRUE(outcome.Has("\n  Player     PageDelay      double     2.50\n"));
+    EXPECT_TRUE(outcome.Has("\n  Player     Width          int        1024\n"));
+    EXPECT_TRUE(outcome.Has("\n  Publish    ServerAddress  undefined\n"));
+    EXPECT_TRUE(outcome.Has("\n  Quiz       Flags          int        26\n"));
+    EXPECT_TRUE(outcome.Has("\n  Shortcuts  ShowGlossary   shortcut   Shift+Ctrl+G\n"));
+    EXPECT_TRUE(outcome.Has("\n  a copy is equal: yes\n"));
+}
+
+TEST_F(Demo, CourseShortcutsAreConverted) {
+    Outcome outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
+    outcome.out.erase(0, std::min(outcome.out.find("Shortcuts\n"), outcome.out.size()));
+    EXPECT_EQ(outcome.Row("Command"), "Command Shortcut Virtual key Hot-key flags");
+    EXPECT_EQ(outcome.Row("FullScreen"), "FullScreen F11 122 0");
+    EXPECT_EQ(outcome.Row("NextPage"), "NextPage PageDown 34 0");
+    EXPECT_EQ(outcome.Row("Replay"), "Replay Ctrl+R 82 2");
+    EXPECT_EQ(outcome.Row("ShowGlossary"), "ShowGlossary Shift+Ctrl+G 71 6");
+    EXPECT_EQ(outcome.Row("ZoomOut"), "ZoomOut - 109 0");
+}
+
+TEST_F(Demo, SettingsOfAnyKindAreTakenAsTheyAre) {
+    Write("odd.ini", "[\n=\n[]\nkey\n[S]]\na=0x\nb=0xFFFFFFFF\nc=9999999999\nd=.\ne=#12345G\nf=.5\n"
+                     "[Shortcuts]\nnone=0\nodd=0x00010041\ntext=F1\n");
+    Outcome const outcome = CheckEmptyError(RunOnFolder());
+    EXPECT_EQ(outcome.status, 0U);
+    EXPECT_TRUE(outcome.Has("\n  S          a         string    0x\n")) << outcome.out;
+    EXPECT_TRUE(outcome.Has("\n  S          b         int       -1\n"));
+    EXPECT_TRUE(outcome.Has("\n  S          c         string    9999999999\n"));
+    EXPECT_TRUE(outcome.Has("\n  S          d         string    .\n"));
+    EXPECT_TRUE(outcome.Has("\n  S          e         string    #12345G\n"));
+    EXPECT_TRUE(outcome.Has("\n  S          f         double    0.50\n"));
+    EXPECT_EQ(outcome.Row("none"), "none 0 0");
+    EXPECT_EQ(outcome.Row("odd"), "odd A 65 0");
+}
+
+TEST_F(Demo, EveryFileHasItsDigest) {
+    Write("empty.bin", "");
+    Write("sub/abc.txt", "abc");
+    Write("used.txt", "two\n");
+    Handle const used(CreateFileW((m_Folder / "used.txt").c_str(), GENERIC_READ | GENERIC_WRITE, 0, nullptr,
+                                  OPEN_EXISTING, 0, nullptr));
+    Outcome outcome = RunOnFolder();
+    outcome.out.erase(0, std::min(outcome.out.find("Digests\n"), outcome.out.size()));
+    EXPECT_EQ(outcome.Row("File"), "File SHA-256");
+    EXPECT_EQ(outcome.Row("empty.bin"), "empty.bin e3b0c44298fc1c149afbf4c8996fb92427ae41e4649b934ca495991b7852b855");
+    EXPECT_EQ(outcome.Row("sub/abc.txt"),
+              "sub/abc.txt ba7816bf8f01cfea414140de5dae2223b00361a396177a9cb410ff61f20015ad");
+    EXPECT_EQ(outcome.Row("used.txt"), "used.txt in use");
+}
+
 TEST_F(Demo, CourseChecksAllHold) {
     Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
     EXPECT_EQ(outcome.Row("pieces unchanged by UTF-8"), "pieces unchanged by UTF-8 and back 6 of 6");
@@ -261,7 +317,7 @@ TEST_F(Demo, LogIsWhereItSaysAndHasAsManyLines) {
     EXPECT_GT(Lines(log), 6U * 3U);
     EXPECT_TRUE(outcome.Has("\n  " + count + " lines written, " + count + " in the file\n")) << outcome.out;
     EXPECT_TRUE(outcome.Has("\\temp\\ktap_log.txt\n")) << outcome.out;
-    EXPECT_NE(log.find(": settings.ini: lines: 32, words: 93\n"), std::string::npos);
+    EXPECT_NE(log.find(": settings.ini: lines: 42, words: 124\n"), std::string::npos);
     // Each line is whole, and every thread has written.
     EXPECT_NE(log.find("worker 1: started\n"), std::string::npos);
     EXPECT_NE(log.find("worker 2: started\n"), std::string::npos);

@@ -3,7 +3,9 @@
 
 #include "CourseAnimation.h"
 #include "CourseCopy.h"
+#include "CourseDigests.h"
 #include "CourseFiles.h"
+#include "CourseProperties.h"
 #include "Options.h"
 #include "ReadCourse.h"
 #include "Report.h"
@@ -60,8 +62,10 @@ int Run(Console const &console, Options const &options) {
     console.Print(ReportTexts(results, limits));
     console.Print(ReportCaptions(results));
     console.Print(ReportDictionaries(results, limits));
+    console.Print(ReportProperties(folder, limits));
     console.Print(ReportOtherFiles(folder, limits));
     console.Print(ReportAnimation(folder));
+    console.Print(ReportDigests(folder, limits));
     {
         CourseCopy const copy(path); // gone again before the run ends
         log.Step("copied to the session folder");

@@ -23,7 +23,7 @@
 
 /// A transform and the frame at which it is reached. Frames are counted in whatever rate the host plays; any int will
 /// do, negative ones too. 84 bytes.
-struct KT_PUBLIC_API KTKeyframe {
+struct KTKeyframe {
     KTTransform transform;
     int frame = 0;
 

@@ -21,7 +21,7 @@
 #include "KTBeginExports.h"
 
 /// Alpha, red, green and blue, in this order; a plain value of 32 bytes.
-struct KT_PUBLIC_API KTARGB {
+struct KTARGB {
     KTReal alpha;
     KTReal red;
     KTReal green;

@@ -1,0 +1,187 @@
+// CKTStreamRead.cpp: the typed stream that reads.
+
+#include "CKTStreamRead.h"
+
+#include "KTAssert.h"
+#include "OByteOrder.h"
+#include "OStreamText.h"
+
+#include <algorithm>
+#include <new>
+
+namespace {
+
+constexpr char kReportPath[] = "source/private/streams/CKTStreamRead";
+constexpr int kMemoryLine = 92;
+constexpr int kBoolLine = 131;
+
+} // namespace
+
+CKTStreamRead::CKTStreamRead() = default;
+CKTStreamRead::CKTStreamRead(CKTStreamRead const &other) = default;
+CKTStreamRead &CKTStreamRead::operator=(CKTStreamRead const &other) = default;
+
+CKTStreamRead::~CKTStreamRead() {
+    delete m_Transport;
+    m_Transport = nullptr;
+}
+
+void CKTStreamRead::SetXferBytes(IKTXferBytes *transport) { m_Transport = transport; }
+
+// ---- bytes and text ----
+
+int CKTStreamRead::XferByte(unsigned char *buffer, int count) {
+    return static_cast<int>(m_Transport->Read(buffer, OArrayBytes<unsigned char>(count)));
+}
+
+unsigned char CKTStreamRead::XferByte(unsigned char &value) {
+    m_Transport->Read(&value, 1);
+    return value;
+}
+
+KTString CKTStreamRead::XferString(KTString &value, bool utf8, bool withCount) try {
+    int count = 0; // stays so where the stream has ended
+    if (withCount) {
+        XferInt32(count);
+    } else {
+        count = OStreamTextSize(value, utf8);
+    }
+    OStreamTextReader text;
+    text.Fill(count, [this](unsigned char *bytes, int size) { return XferByte(bytes, size); });
+    text.Assign(value, utf8);
+    return value;
+} catch (std::bad_alloc const &) {
+    KTAssertFailed("CKTStreamRead::XferString - out of memory", kReportPath, kMemoryLine);
+    return {};
+}
+
+// The last byte of the value comes first. Returns the number of bytes read.
+int CKTStreamRead::XferByteReverse(unsigned char *buffer, int count) {
+    int done = 0;
+    while (done < count && m_Transport->Read(buffer + (count - 1 - done), 1) != 0) {
+        ++done;
+    }
+    return done;
+}
+
+// ---- integers ----
+
+int CKTStreamRead::XferBool(KTBool16 *values, int count) { return XferInt16(values, count); }
+
+KTBool16 CKTStreamRead::XferBool(KTBool16 &value) {
+    short number = value;
+    XferInt16(number);
+    if (number != 0 && number != 1) {
+        KTAssertFailed("CKTStreamRead::XferBool - this isn't a bool you are reading. Something's wrong.", kReportPath,
+                       kBoolLine);
+    }
+    value = number;
+    return value;
+}
+
+int CKTStreamRead::XferInt16(short *values, int count) {
+    unsigned int const read = m_Transport->Read(values, OArrayBytes<short>(count));
+    if (m_Swapping != 0 && count >= 1) {
+        std::transform(values, values + count, values, [](short value) { return OReversed(value); });
+    }
+    return static_cast<int>(read / sizeof(short));
+}
+
+short CKTStreamRead::XferInt16(short &value) {
+    if (m_Swapping == 0) {
+        m_Transport->Read(&value, sizeof value);
+        return value;
+    }
+    short reversed = OReversed(value);
+    m_Transport->Read(&reversed, sizeof reversed);
+    value = OReversed(reversed);
+    return value;
+}
+
+int CKTStreamRead::XferInt32(int *values, int count) {
+    unsigned int const read = m_Transport->Read(values, OArrayBytes<int>(count));
+    if (m_Swapping != 0 && count >= 1) {
+        std::transform(values, values + count, values, [](int value) { return OReversed(value); });
+    }
+    return static_cast<int>(read / sizeof(int));
+}
+
+int CKTStreamRead::XferInt32(int &value) {
+    if (m_Swapping == 0) {
+        m_Transport->Read(&value, sizeof value);
+        return value;
+    }
+    int reversed = OReversed(value);
+    m_Transport->Read(&reversed, sizeof reversed);
+    value = OReversed(reversed);
+    return value;
+}
+
+long long CKTStreamRead::XferInt64(long long &value) {
+    int high = OHighHalf(value);
+    int low = OLowHalf(value);
+    XferInt32(high);
+    XferInt32(low);
+    value = OJoined(high, low);
+    return value;
+}
+
+int CKTStreamRead::XferID(int *values, int count) {
+    for (int i = 0; i < count; ++i) {
+        XferID(values[i]);
+    }
+    return count;
+}
+
+int CKTStreamRead::XferID(int &value) { return XferInt32(value); }
+
+int CKTStreamRead::XferPropertyID(int *values, int count) {
+    for (int i = 0; i < count; ++i) {
+        XferID(values[i]);
+    }
+    return count;
+}
+
+int CKTStreamRead::XferPropertyID(int &value) { return XferInt32(value); }
+
+// ---- reals ----
+
+int CKTStreamRead::XferRealNumber(KTReal *values, int count) {
+    int read = 0;
+    for (int i = 0; i < count && GetStreamState() == kKTStreamStateGood; ++i) {
+        read += ReadReal(values[i]) ? 1 : 0;
+    }
+    return read;
+}
+
+KTReal &CKTStreamRead::XferRealNumber(KTReal &value) {
+    ReadReal(value);
+    return value;
+}
+
+// Whether all bytes of the number came.
+bool CKTStreamRead::ReadReal(KTReal &value) {
+    double number = value.AsDouble();
+    auto *const bytes = reinterpret_cast<unsigned char *>(&number);
+    constexpr int size = sizeof number;
+    int const read = m_Swapping == 0 ? XferByte(bytes, size) : XferByteReverse(bytes, size);
+    value = number;
+    return read == size;
+}
+
+// ---- everything else ----
+
+void CKTStreamRead::Comment(char *) {}
+int CKTStreamRead::Seek(int offset, KTSeekFromWhere origin) {
+    return static_cast<int>(m_Transport->Seek(offset, origin));
+}
+unsigned int CKTStreamRead::Tell() { return m_Transport->Tell(); }
+void CKTStreamRead::SetEndOfStream() { m_Transport->SetEndOfStream(); }
+void CKTStreamRead::Flush() { m_Transport->Flush(); }
+KTStreamState CKTStreamRead::GetStreamState() { return m_Transport->GetStreamState(); }
+KTBool16 CKTStreamRead::IsReading() const { return 1; }
+KTBool16 CKTStreamRead::IsWriting() const { return 0; }
+void CKTStreamRead::SetSwapping(KTBool16 swapping) { m_Swapping = swapping; }
+KTBool16 CKTStreamRead::GetSwapping() const { return m_Swapping; }
+KTBool16 CKTStreamRead::Open() { return 1; }
+void CKTStreamRead::Close() {}

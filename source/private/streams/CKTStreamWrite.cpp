@@ -1,0 +1,177 @@
+// CKTStreamWrite.cpp: the typed stream that writes.
+
+#include "CKTStreamWrite.h"
+
+#include "KTAssert.h"
+#include "OByteOrder.h"
+#include "OStreamText.h"
+
+#include <new>
+
+namespace {
+
+constexpr char kReportPath[] = "source/private/streams/CKTStreamWrite";
+constexpr int kMemoryLine = 84;
+constexpr int kBoolArrayLine = 118;
+constexpr int kBoolLine = 129;
+
+} // namespace
+
+CKTStreamWrite::CKTStreamWrite() = default;
+CKTStreamWrite::CKTStreamWrite(CKTStreamWrite const &other) = default;
+CKTStreamWrite &CKTStreamWrite::operator=(CKTStreamWrite const &other) = default;
+
+CKTStreamWrite::~CKTStreamWrite() {
+    delete m_Transport;
+    m_Transport = nullptr;
+}
+
+void CKTStreamWrite::SetXferBytes(IKTXferBytes *transport) { m_Transport = transport; }
+IKTXferBytes *CKTStreamWrite::GetXferBytes() { return m_Transport; }
+
+// ---- bytes and text ----
+
+int CKTStreamWrite::XferByte(unsigned char *buffer, int count) {
+    return static_cast<int>(m_Transport->Write(buffer, OArrayBytes<unsigned char>(count)));
+}
+
+unsigned char CKTStreamWrite::XferByte(unsigned char &value) {
+    m_Transport->Write(&value, 1);
+    return value;
+}
+
+KTString CKTStreamWrite::XferString(KTString &value, bool utf8, bool withCount) try {
+    OStreamTextWriter const text(value, utf8);
+    if (withCount) {
+        int count = static_cast<int>(text.Count());
+        XferInt32(count);
+    }
+    m_Transport->Write(text.Bytes(), text.Count());
+    return value;
+} catch (std::bad_alloc const &) {
+    KTAssertFailed("CKTStreamWrite::XferString - out of memory", kReportPath, kMemoryLine);
+    return {};
+}
+
+// The last byte of the value goes first. Returns the number of bytes written.
+int CKTStreamWrite::XferByteReverse(unsigned char *buffer, int count) {
+    int done = 0;
+    while (done < count && m_Transport->Write(buffer + (count - 1 - done), 1) != 0) {
+        ++done;
+    }
+    return done;
+}
+
+// ---- integers ----
+
+int CKTStreamWrite::XferBool(KTBool16 *values, int count) {
+    KTAssertFailed("Warning: Using XferBool(KTBool16 *buf, KTInt32 num) is currently not crossplatfom savvy",
+                   kReportPath, kBoolArrayLine);
+    return XferInt16(values, count);
+}
+
+KTBool16 CKTStreamWrite::XferBool(KTBool16 &value) {
+    if (value != 0 && value != 1) {
+        KTAssertFailed("CStreamWrite::XferBool - this isn't a bool you are writing", kReportPath, kBoolLine);
+    }
+    value = value != 0 ? 1 : 0;
+    XferInt16(value);
+    return value;
+}
+
+int CKTStreamWrite::XferInt16(short *values, int count) {
+    if (m_Swapping == 0) {
+        return static_cast<int>(m_Transport->Write(values, OArrayBytes<short>(count)) / sizeof(short));
+    }
+    for (int i = 0; i < count; ++i) {
+        short reversed = OReversed(values[i]);
+        m_Transport->Write(&reversed, sizeof reversed);
+    }
+    return count < 1 ? 0 : count;
+}
+
+short CKTStreamWrite::XferInt16(short &value) {
+    short stored = m_Swapping == 0 ? value : OReversed(value);
+    m_Transport->Write(&stored, sizeof stored);
+    return value;
+}
+
+int CKTStreamWrite::XferInt32(int *values, int count) {
+    if (m_Swapping == 0) {
+        return static_cast<int>(m_Transport->Write(values, OArrayBytes<int>(count)) / sizeof(int));
+    }
+    for (int i = 0; i < count; ++i) {
+        int reversed = OReversed(values[i]);
+        m_Transport->Write(&reversed, sizeof reversed);
+    }
+    return count < 1 ? 0 : count;
+}
+
+int CKTStreamWrite::XferInt32(int &value) {
+    int stored = m_Swapping == 0 ? value : OReversed(value);
+    m_Transport->Write(&stored, sizeof stored);
+    return value;
+}
+
+long long CKTStreamWrite::XferInt64(long long &value) {
+    int high = OHighHalf(value);
+    int low = OLowHalf(value);
+    XferInt32(high);
+    XferInt32(low);
+    return value;
+}
+
+int CKTStreamWrite::XferID(int *values, int count) {
+    for (int i = 0; i < count; ++i) {
+        XferID(values[i]);
+    }
+    return count;
+}
+
+int CKTStreamWrite::XferID(int &value) { return XferInt32(value); }
+
+int CKTStreamWrite::XferPropertyID(int *values, int count) {
+    for (int i = 0; i < count; ++i) {
+        XferID(values[i]);
+    }
+    return count;
+}
+
+int CKTStreamWrite::XferPropertyID(int &value) { return XferInt32(value); }
+
+// ---- reals ----
+
+int CKTStreamWrite::XferRealNumber(KTReal *values, int count) {
+    for (int i = 0; i < count; ++i) {
+        XferRealNumber(values[i]);
+    }
+    return count < 1 ? 0 : count;
+}
+
+KTReal &CKTStreamWrite::XferRealNumber(KTReal &value) {
+    double number = value.AsDouble();
+    auto *const bytes = reinterpret_cast<unsigned char *>(&number);
+    if (m_Swapping == 0) {
+        XferByte(bytes, sizeof number);
+    } else {
+        XferByteReverse(bytes, sizeof number);
+    }
+    return value;
+}
+
+// ---- everything else ----
+
+void CKTStreamWrite::Comment(char *) {}
+int CKTStreamWrite::Seek(int offset, KTSeekFromWhere origin) {
+    return static_cast<int>(m_Transport->Seek(offset, origin));
+}
+unsigned int CKTStreamWrite::Tell() { return m_Transport->Tell(); }
+void CKTStreamWrite::SetEndOfStream() { m_Transport->SetEndOfStream(); }
+void CKTStreamWrite::Flush() { m_Transport->Flush(); }
+KTStreamState CKTStreamWrite::GetStreamState() { return m_Transport->GetStreamState(); }
+KTBool16 CKTStreamWrite::IsReading() const { return 0; }
+KTBool16 CKTStreamWrite::IsWriting() const { return 1; }
+void CKTStreamWrite::SetSwapping(KTBool16 swapping) { m_Swapping = swapping; }
+KTBool16 CKTStreamWrite::GetSwapping() const { return m_Swapping; }
+KTBool16 CKTStreamWrite::Open() { return 1; }
+void CKTStreamWrite::Close() {}

@@ -1,0 +1,20 @@
+// IKTStream.cpp: what the three interfaces of the streams have in common: nothing but being created and destroyed.
+
+#include "IKTStream.h"
+#include "IKTReadWriteStream.h"
+#include "IKTXferBytes.h"
+
+IKTXferBytes::IKTXferBytes() = default;
+IKTXferBytes::IKTXferBytes(IKTXferBytes const &other) = default;
+IKTXferBytes &IKTXferBytes::operator=(IKTXferBytes const &other) = default;
+IKTXferBytes::~IKTXferBytes() = default;
+
+IKTStream::IKTStream() = default;
+IKTStream::IKTStream(IKTStream const &other) = default;
+IKTStream &IKTStream::operator=(IKTStream const &other) = default;
+IKTStream::~IKTStream() = default;
+
+IKTReadWriteStream::IKTReadWriteStream() = default;
+IKTReadWriteStream::IKTReadWriteStream(IKTReadWriteStream const &other) = default;
+IKTReadWriteStream &IKTReadWriteStream::operator=(IKTReadWriteStream const &other) = default;
+IKTReadWriteStream::~IKTReadWriteStream() = default;

@@ -1,0 +1,86 @@
+// OStreamText.cpp: texts on their way between strings and the bytes of a stream.
+
+#include "OStreamText.h"
+
+#include <algorithm>
+#include <cstring>
+#include <limits>
+#include <string_view>
+
+namespace {
+
+constexpr int kFirstPiece = 0x40000; // memory that a length in front of a text may ask for before any byte has come
+
+// Copies the characters one by one, from bytes to units or back, and tells whether all were ASCII.
+template <typename From, typename To> bool CopyAscii(From const *from, std::size_t count, To *to) {
+    unsigned int all = 0;
+    for (std::size_t i = 0; i < count; ++i) {
+        auto const character = static_cast<unsigned int>(static_cast<std::make_unsigned_t<From>>(from[i]));
+        all |= character;
+        to[i] = static_cast<To>(character);
+    }
+    return all < 0x80;
+}
+
+void AssignUtf8(KTString &text, std::string_view bytes) {
+    unsigned short units[kOShortTextUnits];
+    if (bytes.size() <= kOShortTextUnits && CopyAscii(bytes.data(), bytes.size(), units)) {
+        text.assign(units, bytes.size());
+    } else {
+        text = KTString(OString::FromUTF8(bytes));
+    }
+}
+
+} // namespace
+
+int OStreamTextSize(KTString const &text, bool utf8) {
+    std::size_t const size = utf8 ? text.GetUTF8String().size() : text.size() * sizeof(unsigned short);
+    return static_cast<int>(std::min<std::size_t>(size, std::numeric_limits<int>::max()));
+}
+
+OStreamTextWriter::OStreamTextWriter(KTString const &text, bool utf8) {
+    std::size_t count = text.size();
+    if (!utf8) {
+        m_Bytes = const_cast<unsigned short *>(text.c_str());
+        count *= sizeof(unsigned short);
+    } else if (count <= kOShortTextUnits && CopyAscii(text.c_str(), count, m_Short)) {
+        m_Bytes = m_Short;
+    } else {
+        m_Long = text.GetUTF8String();
+        m_Bytes = m_Long.data();
+        count = m_Long.size();
+    }
+    m_Count = static_cast<unsigned int>(count);
+}
+
+// Room for the next piece of `count` bytes in all; returns its size. A text that fits the first piece is read at once,
+// then each piece is as large as all that came before.
+int OStreamTextReader::MakeRoom(int count) {
+    if (count <= m_Capacity) {
+        return std::max(count, 0) - m_Count;
+    }
+    int const capacity = m_Count < kFirstPiece ? std::min(count, kFirstPiece)
+                         : count / 2 < m_Count ? count
+                                               : m_Count * 2;
+    auto const units = (static_cast<std::size_t>(capacity) + 1) / sizeof(unsigned short);
+    auto larger = std::make_unique_for_overwrite<unsigned short[]>(units);
+    if (m_Count != 0) {
+        std::memcpy(larger.get(), m_Units, static_cast<std::size_t>(m_Count));
+    }
+    m_Long = std::move(larger);
+    m_Units = m_Long.get();
+    m_Capacity = capacity;
+    return m_Capacity - m_Count;
+}
+
+void OStreamTextReader::Assign(KTString &text, bool utf8) const {
+    auto const count = static_cast<std::size_t>(m_Count);
+    if (!utf8) {
+        text.assign(m_Units, count / sizeof(unsigned short));
+        return;
+    }
+    auto const *const bytes = reinterpret_cast<char const *>(m_Units);
+    void const *const zero = std::memchr(bytes, 0, count);
+    AssignUtf8(text,
+               {bytes, zero == nullptr ? count : static_cast<std::size_t>(static_cast<char const *>(zero) - bytes)});
+}

@@ -1,0 +1,8 @@
+// IKTGeneralProgressCallBack.cpp: what every implementation of the interface has: being created and destroyed.
+
+#include "IKTGeneralProgressCallBack.h"
+
+IKTGeneralProgressCallBack::IKTGeneralProgressCallBack() = default;
+IKTGeneralProgressCallBack::IKTGeneralProgressCallBack(IKTGeneralProgressCallBack const &other) = default;
+IKTGeneralProgressCallBack &IKTGeneralProgressCallBack::operator=(IKTGeneralProgressCallBack const &other) = default;
+IKTGeneralProgressCallBack::~IKTGeneralProgressCallBack() = default;
