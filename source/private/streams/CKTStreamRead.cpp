@@ -51,7 +51,7 @@ KTString CKTStreamRead::XferString(KTString &value, bool utf8, bool withCount) t
     text.Assign(value, utf8);
     return value;
 } catch (std::bad_alloc const &) {
-    KTAssertFailed("CKTStreamRead::XferString - out of memory", kReportPath, kMemoryLine);
+    OReportNoMemory("CKTStreamRead::XferString - out of memory", kReportPath, kMemoryLine);
     return {};
 }
 

@@ -49,7 +49,7 @@ KTString CKTStreamWrite::XferString(KTString &value, bool utf8, bool withCount) 
     m_Transport->Write(text.Bytes(), text.Count());
     return value;
 } catch (std::bad_alloc const &) {
-    KTAssertFailed("CKTStreamWrite::XferString - out of memory", kReportPath, kMemoryLine);
+    OReportNoMemory("CKTStreamWrite::XferString - out of memory", kReportPath, kMemoryLine);
     return {};
 }
 

@@ -2,9 +2,12 @@
 
 #include "OStreamText.h"
 
+#include "KTAssert.h"
+
 #include <algorithm>
 #include <cstring>
 #include <limits>
+#include <new>
 #include <string_view>
 
 namespace {
@@ -36,6 +39,13 @@ void AssignUtf8(KTString &text, std::string_view bytes) {
 int OStreamTextSize(KTString const &text, bool utf8) {
     std::size_t const size = utf8 ? text.GetUTF8String().size() : text.size() * sizeof(unsigned short);
     return static_cast<int>(std::min<std::size_t>(size, std::numeric_limits<int>::max()));
+}
+
+void OReportNoMemory(char const *message, char const *path, int line) noexcept {
+    try {
+        KTAssertFailed(message, path, line);
+    } catch (std::bad_alloc const &) { // NOLINT(bugprone-empty-catch)
+    }
 }
 
 OStreamTextWriter::OStreamTextWriter(KTString const &text, bool utf8) {
