@@ -12,7 +12,7 @@ jobs=$(nproc)
 build_packages=(g++-mingw-w64-x86-64-posix mingw-w64-x86-64-dev binutils-mingw-w64-x86-64 cmake ninja-build
     wine wine64 googletest libboost1.81-dev xz-utils bzip2)
 native_packages=(clang-19 libclang-rt-19-dev g++ libboost-thread1.81-dev)
-bench_packages=(libspdlog-dev libfmt-dev libutfcpp-dev)
+bench_packages=(libcereal-dev libspdlog-dev libfmt-dev libutfcpp-dev)
 lint_packages=(clang-19 clang-format-19 clang-tidy-19)
 
 usage() {
@@ -110,7 +110,7 @@ write_source_list() {
 need_source() {
     local package=$1 log=$stamps/source.log download=$root/build/apt/$1 archive
     shift
-    [ -e "$stamps/source-$package" ] && return
+    [ "$(cat "$stamps/source-$package" 2>/dev/null)" = "$*" ] && return
     echo "kt: fetching the sources of $package"
     write_source_list
     rm -rf "$download" "$root/build/sources/$package"
@@ -123,7 +123,7 @@ need_source() {
     tar -xf "$archive" -C "$root/build/sources/$package" --strip-components=1 --wildcards "${@/#/*/}" ||
         fail "could not unpack the sources of $package"
     rm -rf "$download"
-    : >"$stamps/source-$package"
+    printf '%s' "$*" >"$stamps/source-$package"
 }
 
 # The project's own Wine prefix: no display, Windows 10, nothing of it outside build/. Wine's debugger, which waits for
@@ -147,7 +147,7 @@ need_wine() {
 need_build_tools() {
     mkdir -p "$stamps"
     need_packages "${build_packages[@]}"
-    need_source boost1.81 libs/thread/src
+    need_source boost1.81 libs/thread/src libs/serialization/src
     need_wine
 }
 

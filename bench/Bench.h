@@ -72,5 +72,6 @@ void AddGrowthBenchmarks();
 void AddFileBenchmarks();
 void AddAnimationBenchmarks();
 void AddDigestBenchmarks();
+void AddStreamBenchmarks();
 
 } // namespace bench

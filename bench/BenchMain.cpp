@@ -53,6 +53,7 @@ int main(int argc, char **argv) {
     bench::AddFileBenchmarks();
     bench::AddAnimationBenchmarks();
     bench::AddDigestBenchmarks();
+    bench::AddStreamBenchmarks();
 
     bench::Report report;
     if (benchmark::RunSpecifiedBenchmarks(&report) == 0) {

@@ -26,10 +26,27 @@ target_link_libraries(kt_bench_peers INTERFACE benchmark KT::boost_headers KT::b
 # Both are used as headers alone: neither is packaged as a library for Windows.
 target_compile_definitions(kt_bench_peers INTERFACE FMT_HEADER_ONLY SPDLOG_HEADER_ONLY)
 
+# Boost.Serialization's binary archives, compiled from the sources that Boost.Thread comes with; elsewhere the installed
+# library is used.
+if(CMAKE_CROSSCOMPILING)
+  file(GLOB serialization_sources ${KT_BOOST_SOURCE}/libs/serialization/src/*.cpp)
+  if(NOT serialization_sources)
+    message(FATAL_ERROR "Boost.Serialization's sources are not in ${KT_BOOST_SOURCE}: run ./kt bench, which fetches them")
+  endif()
+  list(FILTER serialization_sources EXCLUDE REGEX "/(xml|text|polymorphic|basic_text|basic_xml|codecvt|utf8)[^/]*$")
+  add_library(kt_boost_serialization STATIC ${serialization_sources})
+  target_link_libraries(kt_boost_serialization PUBLIC kt_boost_headers)
+  target_compile_options(kt_boost_serialization PRIVATE -w)
+  target_link_libraries(kt_bench_peers INTERFACE kt_boost_serialization)
+else()
+  find_package(Boost 1.81 REQUIRED COMPONENTS serialization)
+  target_link_libraries(kt_bench_peers INTERFACE Boost::serialization)
+endif()
+
 if(CMAKE_CROSSCOMPILING)
   set(peers_only ${CMAKE_BINARY_DIR}/include-peers)
   file(MAKE_DIRECTORY ${peers_only})
-  foreach(header spdlog fmt utf8 utf8.h)
+  foreach(header cereal spdlog fmt utf8 utf8.h)
     if(NOT EXISTS /usr/include/${header})
       message(FATAL_ERROR "/usr/include/${header} is missing: run ./kt bench, which installs its package")
     endif()
