@@ -68,8 +68,14 @@ template <typename Text> struct Record {
     Text title;
 };
 
-template <typename Text> Record<Text> MakeRecord(int i) {
-    return {i, i % 7, 0x100000000LL * i + 5, i * 0.25, i % 3 == 0, Text(i % 2 == 0 ? "Harbour" : "Lifebuoys")};
+// Texts that a KTString holds without memory from the heap, and texts that only a std::string does: the copy that
+// XferString returns needs some then.
+using Titles = char const *const (&)[2];
+constexpr char const *kShortTitles[2] = {"Harbour", "Pier 7"};
+constexpr char const *kTitles[2] = {"Lifebuoys", "Harbour office"};
+
+template <typename Text> Record<Text> MakeRecord(int i, Titles titles) {
+    return {i, i % 7, 0x100000000LL * i + 5, i * 0.25, i % 3 == 0, Text(titles[i % 2])};
 }
 
 struct OurRecord {
@@ -92,9 +98,10 @@ template <typename Archive> void Serialize(Archive &archive, Record<std::string>
     archive & record.number & record.kind & record.changed & record.length & record.isDone & record.title;
 }
 
-void WriteOurs(KTFile const &file, int count) {
+void WriteOurs(std::filesystem::path const &path, int count, Titles titles) {
+    KTFile const file{KTString(path.c_str())};
     std::unique_ptr<IKTStream> const stream(KTStreamUtil::CreateFileStreamWrite(file, kWriteNew, 0, 0));
-    OurRecord records[2] = {{MakeRecord<KTString>(0)}, {MakeRecord<KTString>(1)}};
+    OurRecord records[2] = {{MakeRecord<KTString>(0, titles)}, {MakeRecord<KTString>(1, titles)}};
     for (int i = 0; i < count; ++i) {
         OurRecord &record = records[i % 2];
         record.values.number = i;
@@ -103,7 +110,8 @@ void WriteOurs(KTFile const &file, int count) {
     }
 }
 
-void ReadOurs(KTFile const &file, int count) {
+void ReadOurs(std::filesystem::path const &path, int count) {
+    KTFile const file{KTString(path.c_str())};
     std::unique_ptr<IKTStream> const stream(KTStreamUtil::CreateFileStreamRead(file, kRead, 0, 0));
     OurRecord record;
     for (int i = 0; i < count; ++i) {
@@ -113,10 +121,11 @@ void ReadOurs(KTFile const &file, int count) {
 }
 
 // Archives and plain streams: `write` and `read` move one record.
-template <typename Out, typename Write> void WritePeers(std::filesystem::path const &path, int count, Write write) {
+template <typename Out, typename Write>
+void WritePeers(std::filesystem::path const &path, int count, Titles titles, Write write) {
     std::ofstream file(path, std::ios::binary | std::ios::trunc);
     Out out(file);
-    Record<std::string> records[2] = {MakeRecord<std::string>(0), MakeRecord<std::string>(1)};
+    Record<std::string> records[2] = {MakeRecord<std::string>(0, titles), MakeRecord<std::string>(1, titles)};
     for (int i = 0; i < count; ++i) {
         Record<std::string> &record = records[i % 2];
         record.number = i;
@@ -173,60 +182,79 @@ void GetRecord(std::istream &stream, Record<std::string> &record) {
     stream.read(record.title.data(), size);
 }
 
-using Job = std::function<void(std::filesystem::path const &, int)>;
+using WriteJob = std::function<void(std::filesystem::path const &, int, Titles)>;
+using ReadJob = std::function<void(std::filesystem::path const &, int)>;
 
 // Each iteration makes, or reads, one file of all records.
-void AddRecordJob(Task const &task, char const *contender, int count, Job const &prepare, Job const &job) {
-    Add(task, contender, [task, contender, count, prepare, job](benchmark::State &state) {
-        TempFile const file(task.group + "-" + task.kase + "-" + task.size + contender);
-        if (prepare) {
-            prepare(file.Path(), count);
-        }
+void AddWrite(Task const &task, char const *contender, int count, Titles titles, WriteJob const &write) {
+    Add(task, contender, [task, contender, count, &titles, write](benchmark::State &state) {
+        TempFile const file(task.group + "-write-" + task.size + contender);
         for (auto _ : state) {
-            job(file.Path(), count);
+            write(file.Path(), count, titles);
+        }
+    });
+}
+void AddRead(Task const &task, char const *contender, int count, Titles titles, WriteJob const &write,
+             ReadJob const &read) {
+    Add(task, contender, [task, contender, count, &titles, write, read](benchmark::State &state) {
+        TempFile const file(task.group + "-read-" + task.size + contender);
+        write(file.Path(), count, titles);
+        for (auto _ : state) {
+            read(file.Path(), count);
         }
     });
 }
 
+struct Contender {
+    char const *name;
+    WriteJob write;
+    ReadJob read;
+};
+
+std::vector<Contender> Contenders() {
+    auto const serialize = [](auto &archive, auto &record) { Serialize(archive, record); };
+    auto const fields = [](auto &archive, auto &record) {
+        archive(record.number, record.kind, record.changed, record.length, record.isDone, record.title);
+    };
+    return {
+        {kOurs, WriteOurs, ReadOurs},
+        {kCereal,
+         [fields](auto const &path, int count, Titles titles) {
+             WritePeers<cereal::BinaryOutputArchive>(path, count, titles, fields);
+         },
+         [fields](auto const &path, int count) { ReadPeers<cereal::BinaryInputArchive>(path, count, fields); }},
+        {kBoost,
+         [serialize](auto const &path, int count, Titles titles) {
+             WritePeers<BoostOut>(path, count, titles, serialize);
+         },
+         [serialize](auto const &path, int count) { ReadPeers<BoostIn>(path, count, serialize); }},
+        {kFstream,
+         [](auto const &path, int count, Titles titles) { WritePeers<std::ostream &>(path, count, titles, PutRecord); },
+         [](auto const &path, int count) { ReadPeers<std::istream &>(path, count, GetRecord); }},
+    };
+}
+
 void AddRecords() {
     constexpr int kCount = 1000000;
-    auto const ours = [](auto job) {
-        return [job](std::filesystem::path const &path, int count) { job(KTFile(KTString(path.c_str())), count); };
-    };
-    Job const writeCereal = [](auto const &path, int count) {
-        WritePeers<cereal::BinaryOutputArchive>(path, count, [](auto &out, auto &record) {
-            out(record.number, record.kind, record.changed, record.length, record.isDone, record.title);
-        });
-    };
-    Job const readCereal = [](auto const &path, int count) {
-        ReadPeers<cereal::BinaryInputArchive>(path, count, [](auto &in, auto &record) {
-            in(record.number, record.kind, record.changed, record.length, record.isDone, record.title);
-        });
-    };
-    auto const serialize = [](auto &archive, auto &record) { Serialize(archive, record); };
-    Job const writeBoost = [serialize](auto const &path, int count) { WritePeers<BoostOut>(path, count, serialize); };
-    Job const readBoost = [serialize](auto const &path, int count) { ReadPeers<BoostIn>(path, count, serialize); };
-    Job const writeStream = [](auto const &path, int count) {
-        WritePeers<std::ostream &>(path, count, [](auto &out, auto &record) { PutRecord(out, record); });
-    };
-    Job const readStream = [](auto const &path, int count) {
-        ReadPeers<std::istream &>(path, count, [](auto &in, auto &record) { GetRecord(in, record); });
-    };
-    AddRecordJob({kRecords, "write", "1M"}, kOurs, kCount, {}, ours(WriteOurs));
-    AddRecordJob({kRecords, "write", "1M"}, kCereal, kCount, {}, writeCereal);
-    AddRecordJob({kRecords, "write", "1M"}, kBoost, kCount, {}, writeBoost);
-    AddRecordJob({kRecords, "write", "1M"}, kFstream, kCount, {}, writeStream);
-    AddRecordJob({kRecords, "read", "1M"}, kOurs, kCount, ours(WriteOurs), ours(ReadOurs));
-    AddRecordJob({kRecords, "read", "1M"}, kCereal, kCount, writeCereal, readCereal);
-    AddRecordJob({kRecords, "read", "1M"}, kBoost, kCount, writeBoost, readBoost);
-    AddRecordJob({kRecords, "read", "1M"}, kFstream, kCount, writeStream, readStream);
+    for (Contender const &one : Contenders()) {
+        AddWrite({kRecords, "write", "1M"}, one.name, kCount, kShortTitles, one.write);
+    }
+    for (Contender const &one : Contenders()) {
+        AddRead({kRecords, "read", "1M"}, one.name, kCount, kShortTitles, one.write, one.read);
+    }
+    for (Contender const &one : Contenders()) {
+        AddWrite({kRecords, "write-titles", "1M"}, one.name, kCount, kTitles, one.write);
+    }
+    for (Contender const &one : Contenders()) {
+        AddRead({kRecords, "read-titles", "1M"}, one.name, kCount, kTitles, one.write, one.read);
+    }
     struct Step {
         char const *name;
         int count;
     };
     for (Step const &step : {Step{"1x", 10000}, {"10x", 100000}, {"100x", 1000000}, {"1000x", 10000000}}) {
-        AddRecordJob({kGrowth, "write", step.name}, kOurs, step.count, {}, ours(WriteOurs));
-        AddRecordJob({kGrowth, "read", step.name}, kOurs, step.count, ours(WriteOurs), ours(ReadOurs));
+        AddWrite({kGrowth, "write", step.name}, kOurs, step.count, kShortTitles, WriteOurs);
+        AddRead({kGrowth, "read", step.name}, kOurs, step.count, kShortTitles, WriteOurs, ReadOurs);
     }
 }
 

@@ -8,30 +8,20 @@
 #include <cstring>
 #include <limits>
 #include <new>
-#include <string_view>
 
 namespace {
 
 constexpr int kFirstPiece = 0x40000; // memory that a length in front of a text may ask for before any byte has come
 
-// Copies the characters one by one, from bytes to units or back, and tells whether all were ASCII.
+// Copies the characters one by one, from bytes to units or back. Whether all were ASCII, and none of them zero.
 template <typename From, typename To> bool CopyAscii(From const *from, std::size_t count, To *to) {
     unsigned int all = 0;
     for (std::size_t i = 0; i < count; ++i) {
         auto const character = static_cast<unsigned int>(static_cast<std::make_unsigned_t<From>>(from[i]));
-        all |= character;
+        all |= character | (character - 1); // a zero sets all bits
         to[i] = static_cast<To>(character);
     }
     return all < 0x80;
-}
-
-void AssignUtf8(KTString &text, std::string_view bytes) {
-    unsigned short units[kOShortTextUnits];
-    if (bytes.size() <= kOShortTextUnits && CopyAscii(bytes.data(), bytes.size(), units)) {
-        text.assign(units, bytes.size());
-    } else {
-        text = KTString(OString::FromUTF8(bytes));
-    }
 }
 
 } // namespace
@@ -64,14 +54,10 @@ OStreamTextWriter::OStreamTextWriter(KTString const &text, bool utf8) {
 }
 
 // Room for the next piece of `count` bytes in all; returns its size. A text that fits the first piece is read at once,
-// then each piece is as large as all that came before.
+// then each piece is as large as all that came before. REQUIRES: count is more than the capacity.
 int OStreamTextReader::MakeRoom(int count) {
-    if (count <= m_Capacity) {
-        return std::max(count, 0) - m_Count;
-    }
-    int const capacity = m_Count < kFirstPiece ? std::min(count, kFirstPiece)
-                         : count / 2 < m_Count ? count
-                                               : m_Count * 2;
+    int const doubled = count / 2 < m_Count ? count : m_Count * 2;
+    int const capacity = m_Count < kFirstPiece ? std::min(count, kFirstPiece) : doubled;
     auto const units = (static_cast<std::size_t>(capacity) + 1) / sizeof(unsigned short);
     auto larger = std::make_unique_for_overwrite<unsigned short[]>(units);
     if (m_Count != 0) {
@@ -90,7 +76,11 @@ void OStreamTextReader::Assign(KTString &text, bool utf8) const {
         return;
     }
     auto const *const bytes = reinterpret_cast<char const *>(m_Units);
-    void const *const zero = std::memchr(bytes, 0, count);
-    AssignUtf8(text,
-               {bytes, zero == nullptr ? count : static_cast<std::size_t>(static_cast<char const *>(zero) - bytes)});
+    unsigned short units[kOShortTextUnits];
+    if (count <= kOShortTextUnits && CopyAscii(bytes, count, units)) {
+        text.assign(units, count);
+        return;
+    }
+    auto const *const zero = static_cast<char const *>(std::memchr(bytes, 0, count));
+    text = KTString(OString::FromUTF8({bytes, zero == nullptr ? count : static_cast<std::size_t>(zero - bytes)}));
 }

@@ -50,7 +50,7 @@ class OStreamTextReader {
     /// came; one that returns fewer is the last. Throws std::bad_alloc.
     template <typename Read> void Fill(int count, Read read) {
         do {
-            int const size = MakeRoom(count);
+            int const size = count <= m_Capacity ? RestOf(count) : MakeRoom(count);
             int const came = read(reinterpret_cast<unsigned char *>(m_Units) + m_Count, size);
             m_Count += came < 0 ? 0 : came > size ? size : came;
             if (came < size) {
@@ -63,6 +63,7 @@ class OStreamTextReader {
     void Assign(KTString &text, bool utf8) const;
 
   private:
+    int RestOf(int count) const { return count < 0 ? 0 : count - m_Count; }
     int MakeRoom(int count);
 
     unsigned short m_Short[kOShortTextUnits]; // only what is used is ever written

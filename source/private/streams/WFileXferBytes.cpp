@@ -67,26 +67,28 @@ OTransfer TransferAll(Bytes *bytes, unsigned int count, Transfer transfer) {
     return {true, done};
 }
 
-// Values are a few bytes each: the common lengths become single moves.
+// The first and the last bytes of 2 to 16, as two blocks that may overlap.
+template <typename Block> inline void CopyEnds(unsigned char *to, unsigned char const *from, unsigned int count) {
+    Block first;
+    Block last;
+    std::memcpy(&first, from, sizeof first);
+    std::memcpy(&last, from + count - sizeof last, sizeof last);
+    std::memcpy(to, &first, sizeof first);
+    std::memcpy(to + count - sizeof last, &last, sizeof last);
+}
+
+// Values and short texts are a few bytes each: a call of the general function would cost more than the copy.
 inline void CopyBytes(unsigned char *to, unsigned char const *from, unsigned int count) {
-    switch (count) {
-    case 0:
-        break;
-    case 1:
-        *to = *from;
-        break;
-    case 2:
-        std::memcpy(to, from, 2);
-        break;
-    case 4:
-        std::memcpy(to, from, 4);
-        break;
-    case 8:
-        std::memcpy(to, from, 8);
-        break;
-    default:
+    if (count > 16) {
         std::memcpy(to, from, count);
-        break;
+    } else if (count >= 8) {
+        CopyEnds<std::uint64_t>(to, from, count);
+    } else if (count >= 4) {
+        CopyEnds<std::uint32_t>(to, from, count);
+    } else if (count >= 2) {
+        CopyEnds<std::uint16_t>(to, from, count);
+    } else if (count == 1) {
+        *to = *from;
     }
 }
 
@@ -184,6 +186,17 @@ void FileXferBytes::AssertHandle(int line) const {
 // ---- writing ----
 
 unsigned int FileXferBytes::Write(void *buffer, unsigned int count) {
+    // Nearly every call ends here: what is written is small and fits.
+    auto const fill = static_cast<unsigned int>(m_WriteFill);
+    if (m_Handle != nullptr && m_WriteBuffer != nullptr && count <= m_WriteCapacity - fill) [[likely]] {
+        CopyBytes(m_WriteBuffer + fill, static_cast<unsigned char const *>(buffer), count);
+        m_WriteFill = static_cast<int>(fill + count);
+        return count;
+    }
+    return WriteSlowly(buffer, count);
+}
+
+[[gnu::noinline]] unsigned int FileXferBytes::WriteSlowly(void *buffer, unsigned int count) {
     AssertHandle(kWriteLine);
     if (FlushBuffer(count) == 0) {
         return 0;
@@ -240,27 +253,39 @@ unsigned int FileXferBytes::WriteBytes(void *buffer, unsigned int count) {
 // ---- reading ----
 
 unsigned int FileXferBytes::Read(void *buffer, unsigned int count) {
+    // Nearly every call ends here once reading ahead is on: bytes are buffered, and cover what is asked for.
+    unsigned int const available = m_ReadAheadFill - m_ReadAheadCursor;
+    if (available != 0 && count <= available && m_WriteFill == 0 && m_Handle != nullptr) [[likely]] {
+        CountRead(count);
+        return TakeBuffered(static_cast<unsigned char *>(buffer), count);
+    }
+    return ReadSlowly(static_cast<unsigned char *>(buffer), count);
+}
+
+[[gnu::noinline]] unsigned int FileXferBytes::ReadSlowly(unsigned char *buffer, unsigned int count) {
     AssertHandle(kReadLine);
     bool const isLost = m_WriteFill != 0 && !WriteOutBuffer();
-    NoteRead(count);
-    auto *const bytes = static_cast<unsigned char *>(buffer);
+    CountRead(count);
+    AllocateReadAhead(count);
     unsigned int const available = m_ReadAheadFill - m_ReadAheadCursor;
-    if (available != 0 && count <= available) {
-        return TakeBuffered(bytes, count);
+    unsigned int read = available == 0 ? 0 : TakeBuffered(buffer, std::min(count, available));
+    if (available == 0 || count > available) {
+        read += ReadUnbuffered(buffer + read, count - read);
     }
-    unsigned int const buffered = available == 0 ? 0 : TakeBuffered(bytes, available);
-    unsigned int const read = buffered + ReadUnbuffered(bytes + buffered, count - buffered);
     if (isLost) {
         m_State = kKTStreamStateError; // the end of the file must not hide that bytes were lost
     }
     return read;
 }
 
-// Counts what is asked for. Small reads that follow one another get the buffer; one large first read does not. The count
-// stays at its largest value where more would not fit.
-void FileXferBytes::NoteRead(unsigned int count) {
+// Counts what is asked for; the count stays at its largest value where more would not fit.
+inline void FileXferBytes::CountRead(unsigned int count) {
     unsigned int const room = std::numeric_limits<unsigned int>::max() - m_SequentialReadTotal;
     m_SequentialReadTotal += std::min(count, room);
+}
+
+// Small reads that follow one another get the buffer; one large first read does not.
+void FileXferBytes::AllocateReadAhead(unsigned int count) {
     if (m_ReadAheadBuffer == nullptr && m_SequentialReadTotal >= kReadAheadThreshold &&
         count != m_SequentialReadTotal && count <= kLargestBufferedRead) {
         m_ReadAheadBuffer = new (std::nothrow) unsigned char[kBufferCapacity]; // without it, nothing is read ahead
@@ -273,7 +298,7 @@ void FileXferBytes::EmptyReadAhead() {
     m_ReadAheadFill = 0;
 }
 
-unsigned int FileXferBytes::TakeBuffered(unsigned char *buffer, unsigned int count) {
+inline unsigned int FileXferBytes::TakeBuffered(unsigned char *buffer, unsigned int count) {
     CopyBytes(buffer, m_ReadAheadBuffer + m_ReadAheadCursor, count);
     m_ReadAheadCursor += count;
     return count;

@@ -108,7 +108,10 @@ class KT_PUBLIC_API FileXferBytes : public IKTXferBytes {
   private:
     void AssertHandle(int line) const;
     bool WriteOutBuffer();
-    void NoteRead(unsigned int count);
+    unsigned int WriteSlowly(void *buffer, unsigned int count);
+    unsigned int ReadSlowly(unsigned char *buffer, unsigned int count);
+    void CountRead(unsigned int count);
+    void AllocateReadAhead(unsigned int count);
     void EmptyReadAhead();
     unsigned int TakeBuffered(unsigned char *buffer, unsigned int count);
     unsigned int ReadUnbuffered(unsigned char *buffer, unsigned int count);
