@@ -300,6 +300,30 @@ TEST_F(Demo, CourseFilesAreMeasuredCopiedAndTheCopyIsRemoved) {
     }
 }
 
+// Sizes are exact, times are not looked at.
+TEST_F(Demo, CourseIsSavedAsOneDocumentReadBackComparedAndCloned) {
+    Write("a.txt", "one\n");
+    Outcome const outcome = CheckEmptyError(RunOnFolder());
+    std::size_t const start = outcome.out.find("Document\n");
+    ASSERT_NE(start, std::string::npos) << outcome.out;
+    Outcome section;
+    section.out = outcome.out.substr(start);
+    EXPECT_EQ(section.Row("Step"), "Step Bytes ms Whole");
+    // Marks and version 12, title 4 + 6, lengths of the three lists 12; name 4 + 5, kind 4, size 8, bytes 4 + 4.
+    for (std::string const step : {"saved", "read back", "saved again", "compared", "cloned"}) {
+        EXPECT_TRUE(section.Row(step).starts_with(step + " 63 ")) << outcome.out;
+        EXPECT_TRUE(section.Row(step).ends_with(" yes")) << outcome.out;
+    }
+    EXPECT_TRUE(section.Has("\n  read back and saved again, the document is the same: yes\n")) << outcome.out;
+    EXPECT_TRUE(section.Has("\n  the clone is the same: yes\n")) << outcome.out;
+}
+
+TEST_F(Demo, CourseDocumentHoldsTheExampleCourse) {
+    Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
+    EXPECT_TRUE(outcome.Has("\n  read back and saved again, the document is the same: yes\n")) << outcome.out;
+    EXPECT_TRUE(outcome.Has("\n  the clone is the same: yes\n")) << outcome.out;
+}
+
 TEST_F(Demo, ACourseThatCannotBeCopiedIsStillShown) {
     Write("free.txt", "one\n");
     Write("used.txt", "two\n");

@@ -6,6 +6,7 @@
 #include "CourseDigests.h"
 #include "CourseFiles.h"
 #include "CourseProperties.h"
+#include "DocumentReport.h"
 #include "Options.h"
 #include "ReadCourse.h"
 #include "Report.h"
@@ -70,6 +71,9 @@ int Run(Console const &console, Options const &options) {
         CourseCopy const copy(path); // gone again before the run ends
         log.Step("copied to the session folder");
         console.Print(copy.Report(limits));
+        CourseDocument document(folder, results);
+        console.Print(ReportDocument(document));
+        log.Step("saved as one document, read back, compared and cloned");
     }
     console.Print(ReportChecks(results));
 

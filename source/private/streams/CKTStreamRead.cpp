@@ -4,6 +4,7 @@
 
 #include "KTAssert.h"
 #include "OByteOrder.h"
+#include "OFileShortcut.h"
 #include "OStreamText.h"
 
 #include <algorithm>
@@ -26,16 +27,30 @@ CKTStreamRead::~CKTStreamRead() {
     m_Transport = nullptr;
 }
 
-void CKTStreamRead::SetXferBytes(IKTXferBytes *transport) { m_Transport = transport; }
+void CKTStreamRead::SetXferBytes(IKTXferBytes *transport) {
+    m_Transport = transport;
+    m_IsFile = OFileShortcut::IsFor(transport) ? 1 : 0;
+}
+
+template <typename Value> inline void CKTStreamRead::ReadValue(Value &value) {
+    if (m_IsFile == 0 || !OFileShortcut::Take(static_cast<FileXferBytes &>(*m_Transport), value)) {
+        m_Transport->Read(&value, sizeof value);
+    }
+}
 
 // ---- bytes and text ----
 
 int CKTStreamRead::XferByte(unsigned char *buffer, int count) {
-    return static_cast<int>(m_Transport->Read(buffer, OArrayBytes<unsigned char>(count)));
+    unsigned int const size = OArrayBytes<unsigned char>(count);
+    auto const copy = [=](unsigned char const *from) { OCopyBytes(buffer, from, size); };
+    if (m_IsFile != 0 && size != 0 && OFileShortcut::Take(static_cast<FileXferBytes &>(*m_Transport), size, copy)) {
+        return count;
+    }
+    return static_cast<int>(m_Transport->Read(buffer, size));
 }
 
 unsigned char CKTStreamRead::XferByte(unsigned char &value) {
-    m_Transport->Read(&value, 1);
+    ReadValue(value);
     return value;
 }
 
@@ -89,11 +104,11 @@ int CKTStreamRead::XferInt16(short *values, int count) {
 
 short CKTStreamRead::XferInt16(short &value) {
     if (m_Swapping == 0) {
-        m_Transport->Read(&value, sizeof value);
+        ReadValue(value);
         return value;
     }
     short reversed = OReversed(value);
-    m_Transport->Read(&reversed, sizeof reversed);
+    ReadValue(reversed);
     value = OReversed(reversed);
     return value;
 }
@@ -108,11 +123,11 @@ int CKTStreamRead::XferInt32(int *values, int count) {
 
 int CKTStreamRead::XferInt32(int &value) {
     if (m_Swapping == 0) {
-        m_Transport->Read(&value, sizeof value);
+        ReadValue(value);
         return value;
     }
     int reversed = OReversed(value);
-    m_Transport->Read(&reversed, sizeof reversed);
+    ReadValue(reversed);
     value = OReversed(reversed);
     return value;
 }

@@ -4,6 +4,7 @@
 
 #include "KTAssert.h"
 #include "OByteOrder.h"
+#include "OFileShortcut.h"
 #include "OStreamText.h"
 
 #include <new>
@@ -26,17 +27,35 @@ CKTStreamWrite::~CKTStreamWrite() {
     m_Transport = nullptr;
 }
 
-void CKTStreamWrite::SetXferBytes(IKTXferBytes *transport) { m_Transport = transport; }
+void CKTStreamWrite::SetXferBytes(IKTXferBytes *transport) {
+    m_Transport = transport;
+    m_IsFile = OFileShortcut::IsFor(transport) ? 1 : 0;
+}
 IKTXferBytes *CKTStreamWrite::GetXferBytes() { return m_Transport; }
+
+template <typename Value> inline void CKTStreamWrite::WriteValue(Value const &value) {
+    if (m_IsFile == 0 || !OFileShortcut::Put(static_cast<FileXferBytes &>(*m_Transport), value)) {
+        Value copy = value; // transports take variable bytes, and only read them
+        m_Transport->Write(&copy, sizeof copy);
+    }
+}
+
+inline unsigned int CKTStreamWrite::WriteBytes(void *bytes, unsigned int count) {
+    auto const copy = [=](unsigned char *to) { OCopyBytes(to, static_cast<unsigned char const *>(bytes), count); };
+    if (m_IsFile != 0 && OFileShortcut::Put(static_cast<FileXferBytes &>(*m_Transport), count, copy)) {
+        return count;
+    }
+    return m_Transport->Write(bytes, count);
+}
 
 // ---- bytes and text ----
 
 int CKTStreamWrite::XferByte(unsigned char *buffer, int count) {
-    return static_cast<int>(m_Transport->Write(buffer, OArrayBytes<unsigned char>(count)));
+    return static_cast<int>(WriteBytes(buffer, OArrayBytes<unsigned char>(count)));
 }
 
 unsigned char CKTStreamWrite::XferByte(unsigned char &value) {
-    m_Transport->Write(&value, 1);
+    WriteValue(value);
     return value;
 }
 
@@ -46,7 +65,7 @@ KTString CKTStreamWrite::XferString(KTString &value, bool utf8, bool withCount) 
         int count = static_cast<int>(text.Count());
         XferInt32(count);
     }
-    m_Transport->Write(text.Bytes(), text.Count());
+    WriteBytes(text.Bytes(), text.Count());
     return value;
 } catch (std::bad_alloc const &) {
     OReportNoMemory("CKTStreamWrite::XferString - out of memory", kReportPath, kMemoryLine);
@@ -84,15 +103,13 @@ int CKTStreamWrite::XferInt16(short *values, int count) {
         return static_cast<int>(m_Transport->Write(values, OArrayBytes<short>(count)) / sizeof(short));
     }
     for (int i = 0; i < count; ++i) {
-        short reversed = OReversed(values[i]);
-        m_Transport->Write(&reversed, sizeof reversed);
+        WriteValue(OReversed(values[i]));
     }
     return count < 1 ? 0 : count;
 }
 
 short CKTStreamWrite::XferInt16(short &value) {
-    short stored = m_Swapping == 0 ? value : OReversed(value);
-    m_Transport->Write(&stored, sizeof stored);
+    WriteValue(m_Swapping == 0 ? value : OReversed(value));
     return value;
 }
 
@@ -101,15 +118,13 @@ int CKTStreamWrite::XferInt32(int *values, int count) {
         return static_cast<int>(m_Transport->Write(values, OArrayBytes<int>(count)) / sizeof(int));
     }
     for (int i = 0; i < count; ++i) {
-        int reversed = OReversed(values[i]);
-        m_Transport->Write(&reversed, sizeof reversed);
+        WriteValue(OReversed(values[i]));
     }
     return count < 1 ? 0 : count;
 }
 
 int CKTStreamWrite::XferInt32(int &value) {
-    int stored = m_Swapping == 0 ? value : OReversed(value);
-    m_Transport->Write(&stored, sizeof stored);
+    WriteValue(m_Swapping == 0 ? value : OReversed(value));
     return value;
 }
 

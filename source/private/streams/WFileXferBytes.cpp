@@ -17,6 +17,7 @@
 
 #include "KTAssert.h"
 #include "OFileHandle.h"
+#include "OFileShortcut.h"
 
 #include <algorithm>
 #include <cstring>
@@ -65,31 +66,6 @@ OTransfer TransferAll(Bytes *bytes, unsigned int count, Transfer transfer) {
         }
     }
     return {true, done};
-}
-
-// The first and the last bytes of 2 to 16, as two blocks that may overlap.
-template <typename Block> inline void CopyEnds(unsigned char *to, unsigned char const *from, unsigned int count) {
-    Block first;
-    Block last;
-    std::memcpy(&first, from, sizeof first);
-    std::memcpy(&last, from + count - sizeof last, sizeof last);
-    std::memcpy(to, &first, sizeof first);
-    std::memcpy(to + count - sizeof last, &last, sizeof last);
-}
-
-// Values and short texts are a few bytes each: a call of the general function would cost more than the copy.
-inline void CopyBytes(unsigned char *to, unsigned char const *from, unsigned int count) {
-    if (count > 16) {
-        std::memcpy(to, from, count);
-    } else if (count >= 8) {
-        CopyEnds<std::uint64_t>(to, from, count);
-    } else if (count >= 4) {
-        CopyEnds<std::uint32_t>(to, from, count);
-    } else if (count >= 2) {
-        CopyEnds<std::uint16_t>(to, from, count);
-    } else if (count == 1) {
-        *to = *from;
-    }
 }
 
 unsigned int AccessOf(unsigned int mode) {
@@ -186,14 +162,8 @@ void FileXferBytes::AssertHandle(int line) const {
 // ---- writing ----
 
 unsigned int FileXferBytes::Write(void *buffer, unsigned int count) {
-    // Nearly every call ends here: what is written is small and fits.
-    auto const fill = static_cast<unsigned int>(m_WriteFill);
-    if (m_Handle != nullptr && m_WriteBuffer != nullptr && count <= m_WriteCapacity - fill) [[likely]] {
-        CopyBytes(m_WriteBuffer + fill, static_cast<unsigned char const *>(buffer), count);
-        m_WriteFill = static_cast<int>(fill + count);
-        return count;
-    }
-    return WriteSlowly(buffer, count);
+    auto const copy = [=](unsigned char *to) { OCopyBytes(to, static_cast<unsigned char const *>(buffer), count); };
+    return OFileShortcut::Put(*this, count, copy) ? count : WriteSlowly(buffer, count);
 }
 
 [[gnu::noinline]] unsigned int FileXferBytes::WriteSlowly(void *buffer, unsigned int count) {
@@ -212,7 +182,7 @@ unsigned int FileXferBytes::Write(void *buffer, unsigned int count) {
         KTAssertFailed("FileXferBytes::Write - overflowing buffer", kReportPath, kOverflowLine);
         return 0; // nothing is written behind the buffer
     }
-    CopyBytes(m_WriteBuffer + m_WriteFill, static_cast<unsigned char const *>(buffer), count);
+    OCopyBytes(m_WriteBuffer + m_WriteFill, static_cast<unsigned char const *>(buffer), count);
     m_WriteFill += static_cast<int>(count);
     return count;
 }
@@ -253,19 +223,15 @@ unsigned int FileXferBytes::WriteBytes(void *buffer, unsigned int count) {
 // ---- reading ----
 
 unsigned int FileXferBytes::Read(void *buffer, unsigned int count) {
-    // Nearly every call ends here once reading ahead is on: bytes are buffered, and cover what is asked for.
-    unsigned int const available = m_ReadAheadFill - m_ReadAheadCursor;
-    if (available != 0 && count <= available && m_WriteFill == 0 && m_Handle != nullptr) [[likely]] {
-        CountRead(count);
-        return TakeBuffered(static_cast<unsigned char *>(buffer), count);
-    }
-    return ReadSlowly(static_cast<unsigned char *>(buffer), count);
+    auto const copy = [=](unsigned char const *from) { OCopyBytes(static_cast<unsigned char *>(buffer), from, count); };
+    bool const isTaken = count != 0 && OFileShortcut::Take(*this, count, copy);
+    return isTaken ? count : ReadSlowly(static_cast<unsigned char *>(buffer), count);
 }
 
 [[gnu::noinline]] unsigned int FileXferBytes::ReadSlowly(unsigned char *buffer, unsigned int count) {
     AssertHandle(kReadLine);
     bool const isLost = m_WriteFill != 0 && !WriteOutBuffer();
-    CountRead(count);
+    OFileShortcut::CountRead(*this, count);
     AllocateReadAhead(count);
     unsigned int const available = m_ReadAheadFill - m_ReadAheadCursor;
     unsigned int read = available == 0 ? 0 : TakeBuffered(buffer, std::min(count, available));
@@ -276,12 +242,6 @@ unsigned int FileXferBytes::Read(void *buffer, unsigned int count) {
         m_State = kKTStreamStateError; // the end of the file must not hide that bytes were lost
     }
     return read;
-}
-
-// Counts what is asked for; the count stays at its largest value where more would not fit.
-inline void FileXferBytes::CountRead(unsigned int count) {
-    unsigned int const room = std::numeric_limits<unsigned int>::max() - m_SequentialReadTotal;
-    m_SequentialReadTotal += std::min(count, room);
 }
 
 // Small reads that follow one another get the buffer; one large first read does not.
@@ -298,8 +258,8 @@ void FileXferBytes::EmptyReadAhead() {
     m_ReadAheadFill = 0;
 }
 
-inline unsigned int FileXferBytes::TakeBuffered(unsigned char *buffer, unsigned int count) {
-    CopyBytes(buffer, m_ReadAheadBuffer + m_ReadAheadCursor, count);
+unsigned int FileXferBytes::TakeBuffered(unsigned char *buffer, unsigned int count) {
+    OCopyBytes(buffer, m_ReadAheadBuffer + m_ReadAheadCursor, count);
     m_ReadAheadCursor += count;
     return count;
 }

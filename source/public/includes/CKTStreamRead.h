@@ -60,12 +60,14 @@ class KT_PUBLIC_API CKTStreamRead : public IKTStream {
     void Close() override;
 
   private:
+    template <typename Value> void ReadValue(Value &value);
     int XferByteReverse(unsigned char *buffer, int count);
     bool ReadReal(KTReal &value);
 
     // The order of the fields is part of the binary interface.
     IKTXferBytes *m_Transport = nullptr;
     KTBool16 m_Swapping = 0;
+    KTBool16 m_IsFile = 0; // whether the transport is the library's own on a file; in what was left of 8 bytes
 };
 
 #include "KTEndExports.h"

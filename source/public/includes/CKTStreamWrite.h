@@ -63,11 +63,14 @@ class KT_PUBLIC_API CKTStreamWrite : public IKTStream {
     void Close() override;
 
   private:
+    template <typename Value> void WriteValue(Value const &value);
+    unsigned int WriteBytes(void *bytes, unsigned int count);
     int XferByteReverse(unsigned char *buffer, int count);
 
     // The order of the fields is part of the binary interface.
     IKTXferBytes *m_Transport = nullptr;
     KTBool16 m_Swapping = 0;
+    KTBool16 m_IsFile = 0; // whether the transport is the library's own on a file; in what was left of 8 bytes
 };
 
 #include "KTEndExports.h"

@@ -106,11 +106,12 @@ class KT_PUBLIC_API FileXferBytes : public IKTXferBytes {
     unsigned int WriteBytes(void *buffer, unsigned int count);
 
   private:
+    friend class OFileShortcut; // the typed streams' way to the buffers
+
     void AssertHandle(int line) const;
     bool WriteOutBuffer();
     unsigned int WriteSlowly(void *buffer, unsigned int count);
     unsigned int ReadSlowly(unsigned char *buffer, unsigned int count);
-    void CountRead(unsigned int count);
     void AllocateReadAhead(unsigned int count);
     void EmptyReadAhead();
     unsigned int TakeBuffered(unsigned char *buffer, unsigned int count);
