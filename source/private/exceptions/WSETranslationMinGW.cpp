@@ -18,12 +18,14 @@
 // -fnon-call-exceptions: without that option the compiler takes for granted that only calls throw. The faulting code
 // itself is never resumed, so its volatile registers are free to carry the thunk's arguments.
 
+#include "WSEGuards.h"
 #include "WSETranslation.h"
 
 #include <windows.h>
 
-#include <cstddef>
-#include <cstdint>
+#include <atomic>
+#include <cstring>
+#include <iterator>
 #include <memory>
 #include <stdexcept>
 
@@ -35,6 +37,7 @@ struct Fault {
     CONTEXT context;
     EXCEPTION_POINTERS pointers;
     WKTSETranslator translator;
+    bool canUnwind; // false if the stack is damaged
 };
 
 struct ThreadState {
@@ -43,6 +46,9 @@ struct ThreadState {
     bool isInstalled = false;
     unsigned faultCount = 0;
     Fault faults[2]; // a second fault, while the first is being handled, leaves its record alone
+    bool isSearching = false;
+    bool hasSearchFaulted = false;
+    CONTEXT searchStart;
 };
 
 // Codes of the C++ run-times: GCC's throw, unwinding and forced unwinding, and Visual C++'s throw.
@@ -64,14 +70,6 @@ constexpr DWORD kDirectionFlag = 0x400;
 constexpr DWORD kAlignmentFlag = 0x40000;
 constexpr WORD kPendingX87Exceptions = 0x80FF;
 
-// Whether the address is one of the thread's stack.
-bool IsOnStack(ULONG64 address) {
-    ULONG_PTR low = 0;
-    ULONG_PTR high = 0;
-    GetCurrentThreadStackLimits(&low, &high);
-    return address > low && address < high;
-}
-
 // A call through a bad pointer: the fault counts as one of the call, whose return address is on the stack.
 bool IsBadCall(EXCEPTION_RECORD const &record) {
     constexpr ULONG_PTR kExecute = 8;
@@ -86,10 +84,19 @@ extern "C" {
 
 void KTResumeInTranslator(); // the thunk
 
+// A translator that returns has not taken the exception, and nobody else will. On a damaged stack no exception gets
+// anywhere: the translator's dump is all that can be saved.
 [[noreturn]] __attribute__((used)) void KTTranslateFault(Fault *fault) {
-    fault->translator(fault->record.ExceptionCode, &fault->pointers);
-    // A translator that returns has not taken the exception, and nobody else will.
-    TerminateProcess(GetCurrentProcess(), fault->record.ExceptionCode);
+    DWORD const code = fault->record.ExceptionCode;
+    if (fault->canUnwind) {
+        fault->translator(code, &fault->pointers);
+    } else {
+        try {
+            fault->translator(code, &fault->pointers);
+        } catch (...) { // NOLINT(bugprone-empty-catch)
+        }
+    }
+    TerminateProcess(GetCurrentProcess(), code);
     __builtin_unreachable();
 }
 }
@@ -124,20 +131,38 @@ Fault &Keep(EXCEPTION_POINTERS const &pointers, ThreadState &state) {
     fault.context.ContextFlags &= ~kExtendedState;
     fault.pointers = {&fault.record, &fault.context};
     fault.translator = state.translator;
+    fault.canUnwind = !state.hasSearchFaulted;
     return fault;
 }
 
-void ResumeInThunk(CONTEXT &context, Fault &fault) {
-    ULONG64 returnAddress = context.Rip + 1;
-    ULONG64 stack = context.Rsp;
-    if (IsBadCall(fault.record)) {
-        returnAddress = *reinterpret_cast<ULONG64 const *>(stack); // NOLINT(performance-no-int-to-ptr)
-        stack += sizeof returnAddress;
+// Goes back to the caller of a bad pointer. What is left is the place that the exception counts for.
+CONTEXT PlaceOf(EXCEPTION_POINTERS const &pointers) {
+    CONTEXT place = *pointers.ContextRecord;
+    if (IsBadCall(*pointers.ExceptionRecord)) {
+        std::memcpy(&place.Rip, reinterpret_cast<void const *>(place.Rsp), sizeof place.Rip);
+        place.Rsp += sizeof place.Rip;
+    } else {
+        ++place.Rip;
     }
+    return place;
+}
+
+// A damaged stack may make the search fault in turn: OnException then has this function return from the call of
+// RtlCaptureContext a second time. Nobody guards such a stack.
+__attribute__((noinline)) bool IsGuarded(CONTEXT const &place, ThreadState &state) {
+    state.hasSearchFaulted = false;
+    state.isSearching = true;
+    RtlCaptureContext(&state.searchStart);
+    bool const isGuarded = !state.hasSearchFaulted && WIsGuarded(place);
+    state.isSearching = false;
+    return isGuarded;
+}
+
+void ResumeInThunk(CONTEXT &context, CONTEXT const &place, Fault &fault) {
     context.Rcx = reinterpret_cast<ULONG64>(&fault);
-    context.Rdx = returnAddress;
-    context.R8 = stack;
-    context.Rsp = stack & ~ULONG64{15};
+    context.Rdx = place.Rip;
+    context.R8 = place.Rsp;
+    context.Rsp = place.Rsp & ~ULONG64{15};
     context.Rip = reinterpret_cast<ULONG64>(&KTResumeInTranslator);
     context.EFlags &= ~(kTrapFlag | kDirectionFlag | kAlignmentFlag);
     context.FltSave.StatusWord &= static_cast<WORD>(~kPendingX87Exceptions);
@@ -153,6 +178,7 @@ class Translation {
             Release();
             throw std::runtime_error("no slot or handler left for structured exceptions");
         }
+        WPrepareGuardSearch();
         s_Slot = m_Slot;
     }
     Translation(Translation const &) = delete;
@@ -209,10 +235,22 @@ LONG CALLBACK OnException(EXCEPTION_POINTERS *pointers) {
         return EXCEPTION_CONTINUE_SEARCH;
     }
     ThreadState *const state = Translation::FindState();
-    if (state == nullptr || state->translator == nullptr || !IsOnStack(pointers->ContextRecord->Rsp)) {
+    if (state == nullptr || state->translator == nullptr) {
         return EXCEPTION_CONTINUE_SEARCH;
     }
-    ResumeInThunk(*pointers->ContextRecord, Keep(*pointers, *state));
+    if (state->isSearching) {
+        state->hasSearchFaulted = true;
+        *pointers->ContextRecord = state->searchStart;
+        return EXCEPTION_CONTINUE_EXECUTION;
+    }
+    if (!WIsOnStack(pointers->ContextRecord->Rsp)) {
+        return EXCEPTION_CONTINUE_SEARCH;
+    }
+    CONTEXT const place = PlaceOf(*pointers);
+    if (IsGuarded(place, *state)) {
+        return EXCEPTION_CONTINUE_SEARCH;
+    }
+    ResumeInThunk(*pointers->ContextRecord, place, Keep(*pointers, *state));
     return EXCEPTION_CONTINUE_EXECUTION;
 }
 
