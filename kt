@@ -12,6 +12,7 @@ jobs=$(nproc)
 build_packages=(g++-mingw-w64-x86-64-posix mingw-w64-x86-64-dev binutils-mingw-w64-x86-64 cmake ninja-build
     wine wine64 googletest libboost1.81-dev xz-utils bzip2)
 native_packages=(clang-19 libclang-rt-19-dev g++ libboost-thread1.81-dev)
+test_packages=(llvm-19)
 bench_packages=(libcereal-dev libspdlog-dev libfmt-dev libutfcpp-dev)
 lint_packages=(clang-19 clang-format-19 clang-tidy-19)
 
@@ -22,6 +23,8 @@ usage: ./kt COMMAND
   demo [FOLDER]         run the demo host on examples/course/, or on FOLDER
   test [CTEST-ARGS]     every test; the arguments go to ctest, for example -L strings
   build                 build/windows/bin/ and build/windows/lib/
+  crash-campaign [COUNT]
+                        COUNT processes (1000) that crash while they save, and what is left of their work
   run PROGRAM [ARGS]    any Windows program, with the library on its path; its exit status is passed through
   bench [FILTER [ARGS]] the benchmarks beside their peers; the page is build/bench/index.html; the arguments go to
                         Google Benchmark
@@ -192,8 +195,32 @@ command_demo() {
 }
 
 command_test() {
+    mkdir -p "$stamps"
+    need_packages "${test_packages[@]}"
     build
     ctest --test-dir "$root/build/windows" --output-on-failure --no-tests=error -j "$jobs" "$@"
+}
+
+# In batches, as each process leaves a crash dump, which goes once it has been read.
+command_crash_campaign() {
+    local count=${1:-1000} first=1 batch folder=$root/build/crash-campaign failed=0
+    [[ $count =~ ^[1-9][0-9]*$ ]] || fail "usage: ./kt crash-campaign [COUNT]"
+    mkdir -p "$stamps"
+    need_packages "${test_packages[@]}"
+    build
+    rm -rf "$folder"
+    while [ "$first" -le "$count" ]; do
+        batch=$((count - first + 1 < 50 ? count - first + 1 : 50))
+        mkdir -p "$folder"
+        echo "kt: processes $first to $((first + batch - 1)) of $count"
+        "$root/cmake/wine-run" --temp "$folder/temp" "$root/build/windows/bin/ktcrash.exe" "$batch" "$first" \
+            "Z:${folder//\//\\}" || failed=1
+        "$root/tests/crash/check-dumps" "$folder/dumps" || failed=1
+        rm -rf "$folder/dumps" "$folder/temp"
+        first=$((first + batch))
+    done
+    [ $failed = 0 ] || fail "the campaign found failures; what is left of them is in build/crash-campaign"
+    echo "kt: all $count processes left a readable dump, a whole back-up and every document whole"
 }
 
 command_run() {
@@ -267,6 +294,7 @@ main() {
     local command=${1:-help}
     [ $# = 0 ] || shift
     case $command in
+    crash-campaign) command_crash_campaign "$@" ;;
     demo | test | run | bench | sanitize | fuzz | lint | install) "command_$command" "$@" ;;
     build) build ;;
     help | -h | --help) usage ;;

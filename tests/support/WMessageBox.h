@@ -27,7 +27,7 @@ class WMessageBox {
     static void Wait(std::wstring const &caption, std::function<void(Seen const &)> const &seen) {
         constexpr int kAttempts = 6000;
         for (int attempt = 0; attempt < kAttempts; ++attempt, Sleep(10)) { // a window gives no event
-            HWND const box = FindWindowW(L"#32770", caption.c_str());
+            HWND const box = FindOwn(caption);
             if (box == nullptr || GetDlgItem(box, kText) == nullptr) {
                 continue;
             }
@@ -38,6 +38,18 @@ class WMessageBox {
             }
             return;
         }
+    }
+
+    // Other processes may show boxes with the same caption.
+    static HWND FindOwn(std::wstring const &caption) {
+        for (HWND box = nullptr; (box = FindWindowExW(nullptr, box, L"#32770", caption.c_str())) != nullptr;) {
+            DWORD process = 0;
+            GetWindowThreadProcessId(box, &process);
+            if (process == GetCurrentProcessId()) {
+                return box;
+            }
+        }
+        return nullptr;
     }
 
     static Seen Read(HWND box) {
