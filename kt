@@ -20,7 +20,9 @@ usage() {
     cat <<'TEXT'
 usage: ./kt COMMAND
 
-  demo [FOLDER]         run the demo host on examples/course/, or on FOLDER
+  demo [--crash] [FOLDER]
+                        run the demo host on examples/course/, or on FOLDER; with --crash it faults while it saves, and
+                        LLVM's obj2yaml reads its crash dump
   test [CTEST-ARGS]     every test; the arguments go to ctest, for example -L strings
   build                 build/windows/bin/ and build/windows/lib/
   crash-campaign [COUNT]
@@ -187,11 +189,31 @@ build() {
 }
 
 command_demo() {
+    local crash=
+    if [ "${1:-}" = --crash ]; then
+        crash=1
+        shift
+    fi
     local folder=${1:-$root/examples/course}
-    [ $# -le 1 ] || fail "usage: ./kt demo [FOLDER]"
+    [ $# -le 1 ] || fail "usage: ./kt demo [--crash] [FOLDER]"
     [ -d "$folder" ] || fail "no such folder: $folder"
+    folder=$(cd "$folder" && pwd)
     build
-    "$root/cmake/wine-run" "$root/build/windows/bin/ktdemo.exe" "$(cd "$folder" && pwd)"
+    if [ -n "$crash" ]; then
+        demo_crash "$folder"
+    else
+        "$root/cmake/wine-run" "$root/build/windows/bin/ktdemo.exe" "$folder"
+    fi
+}
+
+# The demo's crash, and what another reader finds in its dump. It ends with status 1, as a fatal error does.
+demo_crash() {
+    local temp=$root/build/demo-crash status=0
+    mkdir -p "$stamps"
+    need_packages "${test_packages[@]}"
+    "$root/cmake/wine-run" --temp "$temp" "$root/build/windows/bin/ktdemo.exe" --crash "$1" || status=$?
+    [ $status = 1 ] || fail "the demo ended with status $status instead of 1"
+    echo "  read by obj2yaml   $("$root/tests/crash/check-dumps" --read "$temp")"
 }
 
 command_test() {

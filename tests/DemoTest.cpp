@@ -492,4 +492,28 @@ TEST_F(Demo, HelpAndWrongUsage) {
     }
 }
 
+// A fault while saving, in a real child of the demo: what the author keeps.
+TEST_F(Demo, CrashingWhileSavingKeepsTheWork) {
+    Outcome const outcome = CheckEmptyError(Run(L"--crash \"" KT_COURSE L"\""));
+    EXPECT_EQ(outcome.status, 1U);
+    EXPECT_TRUE(outcome.Has("Crash while saving\n  texts in project   6\n"
+                            "  structured error   0xC0000005 caught as a C++ exception\n"));
+    EXPECT_TRUE(outcome.Has("message            A fatal error has occured and the application is being terminated."));
+    EXPECT_TRUE(outcome.Has("  clean-up callback  done\n"));
+    EXPECT_FALSE(outcome.Has("NOT whole"));
+    fs::path const project = m_Temp / "ktdemo-project";
+    std::string const backUp = ReadAll(project / "course.ktbak");
+    EXPECT_FALSE(backUp.empty());
+    EXPECT_EQ(backUp, ReadAll(project / "course.ktdoc")); // saved before the crash
+    std::size_t dumps = 0;
+    for (auto const &entry : fs::recursive_directory_iterator(m_Temp)) {
+        dumps += entry.path().extension() == ".dmp" ? 1 : 0;
+    }
+    EXPECT_EQ(dumps, 1U);
+    std::size_t const dump = outcome.out.find("  crash dump         ");
+    ASSERT_NE(dump, std::string::npos);
+    std::string const path = outcome.out.substr(dump + 21, outcome.out.find(" (", dump) - dump - 21);
+    EXPECT_TRUE(fs::exists(fs::path(std::u8string(path.begin(), path.end())))) << path;
+}
+
 } // namespace

@@ -3,7 +3,7 @@
 #include "Options.h"
 
 char const *UsageText() {
-    return "usage: ktdemo [--all] [FOLDER]\n"
+    return "usage: ktdemo [--all | --crash] [FOLDER]\n"
            "\n"
            "Reads every text file below FOLDER (here: the current folder) with the KTPublic library and prints what "
            "it\n"
@@ -13,9 +13,13 @@ char const *UsageText() {
            "their sizes.\n"
            "\n"
            "  --all     print every row; else long tables are cut after 100\n"
+           "  --crash   instead, save the texts as a project in the temporary folder, fault while saving, and show "
+           "what "
+           "the\n"
+           "            library keeps: the work as a .ktbak file, and a crash dump\n"
            "  --help    print this text\n"
            "\n"
-           "Exit status: 0 done, 1 no such folder or nothing readable in it, 2 wrong usage.\n";
+           "Exit status: 0 done, 1 no such folder, nothing readable in it, or --crash, 2 wrong usage.\n";
 }
 
 Options ParseOptions(std::vector<KTString> const &arguments) {
@@ -30,6 +34,8 @@ Options ParseOptions(std::vector<KTString> const &arguments) {
             options.help = true;
         } else if (isOption && argument == "--all") {
             options.all = true;
+        } else if (isOption && argument == "--crash") {
+            options.crash = true;
         } else if (isOption) {
             options.error = "unknown option: " + argument.GetUTF8String();
         } else if (hasFolder) {

@@ -10,9 +10,10 @@
 /// What the command line asks for.
 struct Options {
     KTString folder = ".";
-    bool all = false;  ///< print every row, however many
-    bool help = false; ///< print the usage and nothing else
-    std::string error; ///< not empty: what is wrong with the command line
+    bool all = false;   ///< print every row, however many
+    bool crash = false; ///< crash while saving, instead of reading
+    bool help = false;  ///< print the usage and nothing else
+    std::string error;  ///< not empty: what is wrong with the command line
 };
 
 /// Reads the arguments behind the program's name.

@@ -14,6 +14,7 @@
 #include "RunLog.h"
 #include "Table.h"
 #include "WConsole.h"
+#include "WCrash.h"
 #include "WDisk.h"
 
 #include <algorithm>
@@ -52,6 +53,11 @@ int Run(Console const &console, Options const &options) {
     log.Step("files found: " + std::to_string(folder.files.size()));
     if (folder.files.empty() && folder.notes.empty()) {
         return Fail(console, log, "nothing to read in " + shownPath);
+    }
+    if (options.crash) {
+        log.Step("about to crash");
+        CrashWhileSaving(console, folder);
+        return Fail(console, log, "did not crash");
     }
     std::vector<TextResult> const results = ReadCourse(folder.files, log);
 
