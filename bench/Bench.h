@@ -73,5 +73,6 @@ void AddFileBenchmarks();
 void AddAnimationBenchmarks();
 void AddDigestBenchmarks();
 void AddStreamBenchmarks();
+void AddExceptionBenchmarks();
 
 } // namespace bench

@@ -54,6 +54,7 @@ int main(int argc, char **argv) {
     bench::AddAnimationBenchmarks();
     bench::AddDigestBenchmarks();
     bench::AddStreamBenchmarks();
+    bench::AddExceptionBenchmarks();
 
     bench::Report report;
     if (benchmark::RunSpecifiedBenchmarks(&report) == 0) {

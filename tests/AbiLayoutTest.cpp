@@ -29,6 +29,19 @@
 //     KTQuad3D: KTVector3f bottom left, bottom right, top right, top left
 //     KTTransform: KTMatrix4x4f, KTColor4f     KTKeyframe: KTTransform, i32 frame
 
+//     KTException, KTFatalException, KTNonFatalException, 48 bytes      KTLCException, 80 bytes
+//          0  virtual table                                                  0  virtual table
+//          8  char const *  the key's characters                             8  KTString  reason
+//         16  std::string   a copy of them, or empty                        40  KTString  file
+//     WKTSEHException, 64 bytes: the same, then                             72  i32       line
+//         48  u32  code
+//         56  the system's record
+//
+//     KTExceptionUtils, 24 bytes                                        WKTExceptionUtils, 32 bytes: the same, then
+//          0  virtual table                                                 24  the previous translator
+//          8  bool  crashed
+//         16  IKTExceptionHandler *
+
 #include "KTPublic.h"
 #include "VTable.h"
 
@@ -210,6 +223,44 @@ TEST(AbiLayoutTest, GeometryIsPlainNumbersInOrder) {
     EXPECT_EQ(84U, sizeof(KTKeyframe));
     EXPECT_EQ(0x01020304, ValueAt<int>(&keyframe, 80));
     EXPECT_TRUE(std::is_trivially_copyable_v<KTKeyframe>);
+TEST(AbiLayoutTest, ExceptionsHaveTheirFieldsInOrder) {
+    EXPECT_EQ(48U, sizeof(KTException));
+    EXPECT_EQ(48U, sizeof(KTFatalException));
+    EXPECT_EQ(48U, sizeof(KTNonFatalException));
+    static char const key[] = "key";
+    KTException const ofPointer(key);
+    EXPECT_EQ(key, PointerAt(&ofPointer, 8));
+    EXPECT_TRUE(ValueAt<char *>(&ofPointer, 16) != nullptr);
+    EXPECT_EQ(0U, ValueAt<std::size_t>(&ofPointer, 24)); // the copy's length
+    KTString text("key");
+    KTException const ofText(text);
+    EXPECT_EQ(PointerAt(&ofText, 8), PointerAt(&ofText, 16));
+    EXPECT_EQ(3U, ValueAt<std::size_t>(&ofText, 24));
+
+    EXPECT_EQ(64U, sizeof(WKTSEHException));
+    EXPECT_EQ(80U, sizeof(KTLCException));
+    KTLCException const internal("reason", "file", 0x01020304);
+    EXPECT_EQ(static_cast<void const *>(&internal.GetReason()), reinterpret_cast<char const *>(&internal) + 8);
+    EXPECT_EQ(static_cast<void const *>(&internal.GetFile()), reinterpret_cast<char const *>(&internal) + 40);
+    EXPECT_EQ(0x01020304, ValueAt<int>(&internal, 72));
+}
+
+class QuietHandler final : public IKTExceptionHandler {
+  public:
+    void HandleException(KTException const &) override {}
+};
+
+TEST(AbiLayoutTest, ExceptionUtilsHaveTheirFieldsInOrder) {
+    EXPECT_EQ(24U, sizeof(KTExceptionUtils));
+    EXPECT_EQ(32U, sizeof(WKTExceptionUtils));
+    KTExceptionUtils &utils = KTExceptionUtils::GetInstance();
+    EXPECT_EQ(&utils, &WKTExceptionUtils::GetInstance());
+    EXPECT_FALSE(ValueAt<bool>(&utils, 8));
+    EXPECT_EQ(nullptr, PointerAt(&utils, 16));
+    EXPECT_EQ(nullptr, PointerAt(&utils, 24));
+    static QuietHandler handler;
+    utils.SetHandler(handler);
+    EXPECT_EQ(static_cast<void *>(&handler), PointerAt(&utils, 16));
 }
 
 TEST(AbiLayoutTest, NumbersAreFixed) {

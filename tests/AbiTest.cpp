@@ -194,6 +194,16 @@ VTableRow const kTables[] = {
          "KTMemoryDataProvider::FreeDataMemory(void*)"}),
     VTableOf<IKTGeneralProgressCallBack>(
         {"pure ~", "pure", "pure", "pure", "pure", "pure", "pure", "pure", "pure", "pure", "pure", "pure"}),
+    VTableOf<KTException>({"~", "KTException::what() const", "KTException::What() const"}),
+    VTableOf<KTFatalException>({"~", "KTException::what() const", "KTException::What() const"}),
+    VTableOf<KTNonFatalException>({"~", "KTException::what() const", "KTException::What() const"}),
+    VTableOf<WKTSEHException>({"~", "KTException::what() const", "KTException::What() const"}),
+    VTableOf<KTLCException>({"~", "std::exception::what() const"}),
+    VTableOf<IKTExceptionHandler>({"pure", "pure ~"}),
+    VTableOf<KTExceptionUtils>({"pure ~", "pure", "pure", "pure"}),
+    VTableOf<WKTExceptionUtils>({"~", "WKTExceptionUtils::InstallExceptionHandlerImpl()",
+                                 "WKTExceptionUtils::DefaultHandler(KTException const&)",
+                                 "WKTExceptionUtils::RestorePreviousHandler() const"}),
 };
 
 constexpr std::size_t kCompleteDestructor = 0; // entries of a class whose first slot is its destructor
@@ -276,6 +286,7 @@ TEST(AbiTest, ObjectsPointToTheLibrarysTables) {
     EXPECT_EQ(ExportedTable<KTDuration>(), TableOfObject(&duration));
     EXPECT_EQ(ExportedTable<KTScrapDataFlavor>(), TableOfObject(&flavor));
     EXPECT_EQ(ExportedTable<WKTLogger>(), TableOfObject(gKTLogger));
+    EXPECT_EQ(ExportedTable<WKTExceptionUtils>(), TableOfObject(&KTExceptionUtils::GetInstance()));
 }
 
 // The header's declarations give hosts' calls their entries, so they must count as the library does.

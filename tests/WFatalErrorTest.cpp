@@ -12,6 +12,7 @@
 #include <gtest/gtest.h>
 
 #include <atomic>
+#include <exception>
 #include <fstream>
 #include <iterator>
 #include <stdexcept>
@@ -297,6 +298,23 @@ TEST(FatalErrorTest, AFaultingBackUpCallbackIsReported) {
     EXPECT_EQ("went on\natexit\nstatic destructor\n", outcome.trace);
     EXPECT_TRUE(outcome.HasLogged("CreateFile failed. Error: 5")); // its dump was tried
     EXPECT_TRUE(outcome.HasLogged(kNotHandled));
+}
+
+// ---- a host's terminate handler ----
+
+TEST(FatalErrorTest, DISABLED_TerminateHandler) {
+    SetUpHost();
+    WImportHook const hook(L"KTPublic.dll", "CreateFileW", &RefuseFile);
+    std::set_terminate([] { KTExceptionUtils::HandleException(KTFatalException(kKTExceptionMsgStr)); });
+    WMessageBox const user(kCaption, [](WMessageBox::Seen const &) { Trace("box"); });
+    []() noexcept { wfaults::Read(); }();
+}
+
+// A fault that no catch clause can be reached from still saves the work, if the host asks for it.
+TEST(FatalErrorTest, ATerminateHandlerMayHandOver) {
+    Outcome const outcome = RunChild("TerminateHandler");
+    EXPECT_EQ(1U, outcome.status);
+    EXPECT_EQ("back-up, crashed\nbox\nclean-up 1\nclean-up 2\n", outcome.trace);
 }
 
 // ---- a client handler that leaves it to the default ----

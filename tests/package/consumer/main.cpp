@@ -4,6 +4,7 @@
 
 #include <windows.h>
 
+#include <cstdint>
 #include <cstdio>
 #include <exception>
 
@@ -19,6 +20,15 @@ int main() {
         lock.lock();
     } catch (std::exception const &error) {
         std::printf("caught %s\n", error.what()[0] != 0 ? "an exception" : "nothing");
+    }
+
+    // Compiled with the option that the package brings.
+    KTExceptionUtils::InstallExceptionHandler();
+    try {
+        std::uintptr_t volatile address = 0x40;
+        *reinterpret_cast<int volatile *>(address) = 1; // NOLINT(performance-no-int-to-ptr)
+    } catch (WKTSEHException const &fault) {
+        std::printf("caught fault %X\n", fault.getSENumber());
     }
 
     gKTLogger->Log("written by %s", "the consumer");
