@@ -45,10 +45,10 @@ struct ThreadState {
     WKTSETranslator previous = nullptr;
     bool isInstalled = false;
     unsigned faultCount = 0;
-    Fault faults[2]; // a second fault, while the first is being handled, leaves its record alone
+    Fault faults[2]{}; // a second fault, while the first is being handled, leaves its record alone
     bool isSearching = false;
     bool hasSearchFaulted = false;
-    CONTEXT searchStart;
+    CONTEXT searchStart{};
 };
 
 // Codes of the C++ run-times: GCC's throw, unwinding and forced unwinding, and Visual C++'s throw.
