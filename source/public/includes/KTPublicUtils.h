@@ -15,6 +15,7 @@
 #include "KTBeginExports.h"
 
 class IKTStream;
+class IKTStringDictionary;
 
 /// The functions that GenerateHash knows.
 enum KTHashFunctionEnum : int {
@@ -83,6 +84,11 @@ class KT_PUBLIC_API KTPublicUtils {
     /// The text, ": " and the number as a standard output stream writes it by default (six significant digits), for
     /// example "fps: 29.97".
     static std::string ConstructLogStr(std::string text, float value);
+
+    /// The process-wide string dictionary (KTStringDictionary.h), made by the first call. Not locked: the first call is
+    /// to be made on one thread, at start-up. If there is no memory for it the assertion
+    /// "KTStringDictionary::GetStringDictionary()" is reported and KTLCException (kKTErrorInternal) thrown.
+    static IKTStringDictionary &GetStringDictionary();
 };
 
 #include "KTEndExports.h"
