@@ -10,11 +10,11 @@
 
 namespace orvik_private {
 
-/// A file that is being written. It is gone again unless Close is called.
+/// A file that is being written. It is gone again unless Finish is called.
 class NewFile : public ByteSink {
   public:
-    /// Writes out what is pending and keeps the file. Throws std::runtime_error when the device fails.
-    virtual void Close() = 0;
+    /// Writes out what is pending and keeps the file. False when the device fails; the file is then gone, too.
+    virtual bool Finish() = 0;
 };
 
 /// Opens a file for reading; others may read it meanwhile. Null if that cannot be done, as for a folder.

@@ -118,6 +118,7 @@ class FastArray final : public RefCountObj {
     std::uint32_t m_EntryTotal = 0;
     std::uint32_t m_SecondTotal = 0;
     std::uint32_t m_DeadCount = 0;
+    bool m_FilesHaveKeys = true; // what the last file said, for files that do not say it
 };
 
 } // namespace orvik_private

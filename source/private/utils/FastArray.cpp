@@ -1,0 +1,147 @@
+// FastArray.cpp: adding, finding and listing entries.
+
+#include "FastArray.h"
+
+#include "DictionaryBlock.h"
+
+#include <algorithm>
+#include <limits>
+#include <utility>
+
+namespace orvik_private {
+
+namespace {
+
+constexpr std::uint32_t kMostEntries = 0xFFFFFFFE;
+
+} // namespace
+
+FastArray::FastArray() = default;
+
+FastArray::~FastArray() = default;
+
+DictionaryBlock &FastArray::BlockOf(std::uint32_t index) const noexcept {
+    if (m_Blocks.size() == 1) {
+        return *m_Blocks.front();
+    }
+    auto const after = std::upper_bound(m_Blocks.begin(), m_Blocks.end(), index,
+                                        [](std::uint32_t at, auto const &block) { return at < block->Base(); });
+    return **std::prev(after);
+}
+
+DictionaryBlock &FastArray::BlockForAdding() {
+    if (m_Blocks.empty() || !m_Blocks.back()->HasKeys()) {
+        m_Blocks.push_back(std::make_unique<DictionaryBlock>(m_EntryTotal, true));
+    }
+    return *m_Blocks.back();
+}
+
+std::string_view FastArray::Key(std::uint32_t index) const noexcept {
+    DictionaryBlock const &block = BlockOf(index);
+    return block.Key(index - block.Base());
+}
+
+bool FastArray::IsAlive(std::uint32_t index) const noexcept {
+    DictionaryBlock const &block = BlockOf(index);
+    return block.IsAlive(index - block.Base());
+}
+
+UnitsView FastArray::Value(std::uint32_t index, KTUnits &scratch) const {
+    DictionaryBlock const &block = BlockOf(index);
+    std::uint32_t const position = index - block.Base();
+    if (block.IsReplaced(position)) {
+        return m_Replaced.at(index);
+    }
+    return block.IsAlive(position) ? block.Value(position, scratch) : UnitsView();
+}
+
+std::uint32_t FastArray::FindTagged(std::uint32_t tag, std::string_view key) const noexcept {
+    return m_Index.Find(tag, [&](std::uint32_t entry) { return Key(entry) == key; });
+}
+
+std::int64_t FastArray::Find(std::string_view key) const noexcept {
+    if (key.empty()) {
+        return kNotFound;
+    }
+    std::uint32_t const index = FindTagged(m_Index.TagOf(key), key);
+    return index == KeyIndex::kNone ? kNotFound : index;
+}
+
+std::int64_t FastArray::Add(std::string_view key, UnitsView value) {
+    constexpr std::size_t kMostBytes = 0xFFFFFFF0;
+    if (key.empty() || key.size() > kMostBytes || value.size() > kMostBytes / sizeof(unsigned short)) {
+        return kNotFound;
+    }
+    std::uint32_t const tag = m_Index.TagOf(key);
+    if (std::uint32_t const index = FindTagged(tag, key); index != KeyIndex::kNone) {
+        m_Replaced.insert_or_assign(index, KTUnits(value));
+        DictionaryBlock &block = BlockOf(index);
+        block.SetMark(index - block.Base(), kReplacedMark);
+        return index;
+    }
+    if (m_EntryTotal == kMostEntries) {
+        return kNotFound;
+    }
+    m_Index.Reserve(m_Index.Count() + 1);
+    BlockForAdding().Add(key, value);
+    std::uint32_t const index = m_EntryTotal++;
+    m_Index.Link(tag, index, [](std::uint32_t) { return false; });
+    AddToSecondTotal(1);
+    return index;
+}
+
+void FastArray::AddToSecondTotal(std::uint32_t count) noexcept {
+    m_SecondTotal = count > std::numeric_limits<std::uint32_t>::max() - m_SecondTotal
+                        ? std::numeric_limits<std::uint32_t>::max()
+                        : m_SecondTotal + count;
+}
+
+bool FastArray::List(std::uint32_t index, std::uint32_t &block, KTUnits &scratch, ListedEntry &entry) const {
+    while (block + 1 < m_Blocks.size() && m_Blocks[block + 1]->Base() <= index) {
+        ++block;
+    }
+    DictionaryBlock const &in = *m_Blocks[block];
+    std::uint32_t const position = index - in.Base();
+    if (!in.IsAlive(position)) {
+        return false;
+    }
+    entry.index = index;
+    entry.block = block;
+    entry.hasKey = in.HasKeys();
+    entry.key = in.HasKeys() ? in.Key(position) : std::string_view();
+    entry.value = in.IsReplaced(position) ? UnitsView(m_Replaced.at(index)) : in.Value(position, scratch);
+    return true;
+}
+
+void FastArray::Append(std::unique_ptr<DictionaryBlock> block, DictionaryObserver *observer) {
+    std::uint32_t const count = block->Count();
+    if (count == 0) {
+        return;
+    }
+    if (block->HasKeys()) {
+        m_Index.Reserve(m_Index.Count() + count);
+    }
+    m_Blocks.push_back(std::move(block));
+    DictionaryBlock const &added = *m_Blocks.back();
+    m_EntryTotal += count;
+    for (std::uint32_t position = 0; added.HasKeys() && position < count; ++position) {
+        std::string_view const key = added.Key(position);
+        if (key.empty()) {
+            continue;
+        }
+        auto const isKey = [&](std::uint32_t entry) { return Key(entry) == key; };
+        std::uint32_t const before = m_Index.Link(m_Index.TagOf(key), added.Base() + position, isKey);
+        if (before == KeyIndex::kNone) {
+            continue;
+        }
+        DictionaryBlock &earlier = BlockOf(before);
+        earlier.SetMark(before - earlier.Base(), kDeadMark);
+        m_Replaced.erase(before);
+        ++m_DeadCount;
+        if (observer != nullptr) {
+            observer->OnProblem({DictionaryProblemKind::DuplicateKey, 0, 0, std::string(key), {}});
+        }
+    }
+}
+
+} // namespace orvik_private

@@ -1,0 +1,159 @@
+// KTStringDictionary.cpp: the facade: KTString on one side, the engine's bytes and units on the other.
+
+#include "KTStringDictionary.h"
+
+#include "DictionaryFile.h"
+#include "DictionaryReader.h"
+
+#include <algorithm>
+#include <array>
+#include <new>
+
+using orvik_private::DictionaryForm;
+using orvik_private::DictionaryReader;
+using orvik_private::UnitsView;
+
+namespace {
+
+// A key as UTF-8. Keys are ASCII and short nearly always, and are looked up all the time, so such ones need no memory.
+class KeyBytes {
+  public:
+    explicit KeyBytes(KTString const &key) {
+        unsigned short const *const units = key.c_str();
+        std::size_t const count = key.size();
+        if (count <= m_Short.size()) {
+            unsigned all = 0;
+            for (std::size_t i = 0; i < count; ++i) {
+                all |= units[i];
+                m_Short[i] = static_cast<char>(units[i]);
+            }
+            if (all < 0x80) {
+                m_Bytes = {m_Short.data(), count};
+                return;
+            }
+        }
+        m_Long = key.GetUTF8String();
+        m_Bytes = m_Long;
+    }
+    KeyBytes(KeyBytes const &) = delete;
+    KeyBytes &operator=(KeyBytes const &) = delete;
+    ~KeyBytes() = default;
+
+    std::string_view Get() const { return m_Bytes; }
+
+  private:
+    std::array<char, 256> m_Short; // only what is used is ever written
+    std::string m_Long;
+    std::string_view m_Bytes;
+};
+
+UnitsView ViewOf(KTString const &text) { return {text.c_str(), text.size()}; }
+
+// The text up to its first zero.
+UnitsView UpToZero(UnitsView text) {
+    constexpr std::size_t kAtOnce = 16;
+    std::size_t at = 0;
+    for (; at + kAtOnce <= text.size(); at += kAtOnce) {
+        bool hasZero = false;
+        for (std::size_t i = 0; i < kAtOnce; ++i) {
+            hasZero |= text[at + i] == 0;
+        }
+        if (hasZero) {
+            break;
+        }
+    }
+    while (at < text.size() && text[at] != 0) {
+        ++at;
+    }
+    return text.substr(0, at);
+}
+
+} // namespace
+
+IKTStringDictionary::IKTStringDictionary() = default;
+
+IKTStringDictionary::IKTStringDictionary(IKTStringDictionary const &) = default;
+
+IKTStringDictionary &IKTStringDictionary::operator=(IKTStringDictionary const &) = default;
+
+IKTStringDictionary::~IKTStringDictionary() = default;
+
+KTStringDictionary *KTStringDictionary::m_StringDictionary = nullptr;
+
+KTStringDictionary *KTStringDictionary::GetStringDictionary() {
+    if (m_StringDictionary == nullptr) {
+        m_StringDictionary = new (std::nothrow) KTStringDictionary;
+    }
+    return m_StringDictionary;
+}
+
+KTStringDictionary::KTStringDictionary() {
+    try {
+        m_Dictionary = std::make_unique<DictionaryReader>();
+    } catch (std::bad_alloc const &) {
+        m_Dictionary = nullptr; // every operation says what it does then
+    }
+}
+
+KTStringDictionary::~KTStringDictionary() {
+    if (m_StringDictionary == this) {
+        m_StringDictionary = nullptr;
+    }
+}
+
+KTErrorCodeEnum KTStringDictionary::AddString(KTString const &key, KTString const &value) {
+    if (m_Dictionary != nullptr) {
+        m_Dictionary->Add(KeyBytes(key).Get(), ViewOf(value));
+    }
+    return kKTErrorNone;
+}
+
+KTErrorCodeEnum KTStringDictionary::AddString(char const *key, char const *value) {
+    if (key == nullptr || value == nullptr) {
+        return kKTErrorFailed;
+    }
+    // Through the table, for classes that derive from this one.
+    return static_cast<IKTStringDictionary *>(this)->AddString(KTString(key), KTString(value));
+}
+
+KTString KTStringDictionary::GetKeyValue(KTString const &key) {
+    KTString result;
+    if (m_Dictionary == nullptr) {
+        return result;
+    }
+    KTUnits scratch;
+    UnitsView text;
+    m_Dictionary->Lookup(KeyBytes(key).Get(), scratch, text);
+    text = UpToZero(text);
+    result.append(text.data(), text.size());
+    return result;
+}
+
+KTErrorCodeEnum KTStringDictionary::WriteToFile(KTFile const &file, bool binary) {
+    if (m_Dictionary == nullptr || file.Exists()) {
+        return kKTErrorFailed;
+    }
+    bool isTaken = false;
+    auto const target = orvik_private::CreateDictionaryFile(file.GetOPath(), isTaken);
+    if (target == nullptr) {
+        return isTaken ? kKTErrorFailed : kKTErrorNone;
+    }
+    DictionaryForm form;
+    form.isBinary = binary;
+    bool isComplete = false;
+    m_Dictionary->Write(*target, form, &isComplete);
+    if (isComplete) {
+        target->Finish();
+    }
+    return kKTErrorNone;
+}
+
+KTErrorCodeEnum KTStringDictionary::ReadFromFile(KTFile const &file) {
+    if (m_Dictionary == nullptr || !file.Exists()) {
+        return kKTErrorFailed;
+    }
+    if (auto const source = orvik_private::OpenDictionaryFile(file.GetOPath()); source != nullptr) {
+        m_Dictionary->Read(*source);
+    }
+    return kKTErrorNone;
+}
