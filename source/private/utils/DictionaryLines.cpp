@@ -173,7 +173,7 @@ void WriteText(FastArray const &array, ByteSink &sink, int encoding, std::endian
     constexpr std::size_t kPiece = std::size_t{1} << 14;
     std::string bytes;
     if (encoding == kEncodingNone) {
-        bytes = order == std::endian::little ? "\xFF\xFE" : "\xFE\xFF";
+        bytes.append(order == std::endian::little ? "\xFF\xFE" : "\xFE\xFF", 2);
     }
     array.ForEach([&](ListedEntry const &entry) {
         if (entry.key.empty() && entry.value.empty()) {

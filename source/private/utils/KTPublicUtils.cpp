@@ -6,6 +6,7 @@
 #include "KTAssert.h"
 #include "KTBase64.h"
 #include "KTHttpDate.h"
+#include "KTStringDictionary.h"
 #include "ODigest.h"
 
 #include <algorithm>
@@ -171,4 +172,15 @@ std::string KTPublicUtils::ConstructLogStr(std::string text, float value) {
     std::ostringstream stream;
     stream << text << ": " << value;
     return stream.str();
+}
+
+IKTStringDictionary &KTPublicUtils::GetStringDictionary() {
+    KTStringDictionary *const dictionary = KTStringDictionary::GetStringDictionary();
+    if (dictionary == nullptr) {
+        constexpr char kPath[] = "source/private/utils/KTPublicUtils";
+        constexpr KTInt32 kLine = 159;
+        KTAssertFailed("KTStringDictionary::GetStringDictionary()", kPath, kLine);
+        throw KTLCException(KTString(kKTErrorInternal), kPath, kLine);
+    }
+    return *dictionary;
 }
