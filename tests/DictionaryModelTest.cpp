@@ -35,9 +35,9 @@ struct Model {
     }
 };
 
-class Run {
+class RandomRun {
   public:
-    explicit Run(unsigned seed) : m_Random(seed) {}
+    explicit RandomRun(unsigned seed) : m_Random(seed) {}
 
     void Step() {
         switch (Below(12)) {
@@ -148,7 +148,7 @@ TEST(DictionaryModelTest, BehavesAsAPlainListOfKeysAndTexts) {
     unsigned const seed = Seed();
     std::printf("KT_SEED=%u\n", seed);
     for (unsigned round = 0; round < 20; ++round) {
-        Run run(seed + round);
+        RandomRun run(seed + round);
         for (int step = 0; step < 400; ++step) {
             run.Step();
         }

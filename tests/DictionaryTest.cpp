@@ -112,7 +112,7 @@ TEST_F(DictionaryTest, TextsAreCutAtTheirFirstZero) {
 
 TEST_F(DictionaryTest, LongAndForeignKeysAreFoundToo) {
     for (std::size_t const length : {1U, 15U, 255U, 256U, 257U, 5000U}) {
-        for (unsigned short const unit : {0x41, 0x7F, 0x80, 0xE9, 0x263A}) {
+        for (unsigned short const unit : Units{0x41, 0x7F, 0x80, 0xE9, 0x263A}) {
             KTString const key = FromUnits(Units(length, unit));
             KTString const value = FromUnits({static_cast<unsigned short>(length), unit});
             Texts().AddString(key, value);

@@ -36,7 +36,7 @@ TEST(DictionaryUnescapeTest, CaretEscapesOfBothTables) {
     };
     std::string known = "e^";
     for (Row const &row : kRows) {
-        KTUnits const text = Ascii({'^', row.letter});
+        KTUnits const text = Ascii(std::string{'^', row.letter});
         EXPECT_EQ(row.result, Un(text)) << row.letter;
         EXPECT_EQ(row.result, Un(text, CaretTable::Second)) << row.letter;
         known += row.letter;
@@ -130,6 +130,9 @@ TEST(DictionaryUnescapeTest, HasThe132EntitiesInTheirOrder) {
 TEST(DictionaryUnescapeTest, ThePrefixRuleHoldsForEveryName) {
     for (auto const &entity : kHtml) {
         for (char letter = 0x21; letter < 0x7F; ++letter) {
+            if (letter == '^' || letter == '\\') {
+                continue; // takes the next character away before entities are looked for
+            }
             std::string const text = "#{" + std::string(entity.name) + letter + "}";
             std::string const after = text.substr(2);
             bool isKnown = letter == '}';

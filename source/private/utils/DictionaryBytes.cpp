@@ -34,6 +34,9 @@ std::string_view BufferedSource::Peek(std::size_t count) {
 }
 
 bool BufferedSource::Fill() {
+    if (m_Piece == nullptr) {
+        return false;
+    }
     m_Before += m_End;
     m_At = 0;
     m_End = m_Source.Read(m_Piece.get(), kPiece);
@@ -49,6 +52,7 @@ std::size_t BufferedSource::TakeRest(unsigned char *bytes) {
     std::size_t const room = static_cast<std::size_t>(Left());
     std::size_t done = std::min(room, m_End - m_At);
     std::memcpy(bytes, m_Piece.get() + m_At, done);
+    m_Piece.reset();
     while (done < room) {
         std::size_t const got = m_Source.Read(bytes + done, room - done);
         if (got == 0) {
@@ -56,7 +60,7 @@ std::size_t BufferedSource::TakeRest(unsigned char *bytes) {
         }
         done += got;
     }
-    m_Before += m_At + done;
+    m_Before = m_Source.Size();
     m_At = m_End = 0;
     return done;
 }

@@ -99,7 +99,7 @@ class BufferedSource {
     std::uint64_t Left() const;
 
     /// Reads what is left into `bytes`, which has room for Left() of them; the number read, fewer if the source failed
-    /// or got shorter.
+    /// or got shorter. The buffer is given back, and there is nothing more to take.
     std::size_t TakeRest(unsigned char *bytes);
 
     bool Failed() const { return m_Source.Failed(); }

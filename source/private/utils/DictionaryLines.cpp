@@ -157,7 +157,7 @@ bool SurvivesTextForm(std::string_view key, UnitsView value, int encoding) {
     }
     UnitsView entry = FindEntry(line).text;
     std::size_t const equals = entry.find('=');
-    if (entry.empty() || entry[0] == '$' || equals != key.size()) {
+    if (key.empty() || entry.empty() || entry[0] == '$' || equals != key.size()) {
         return false;
     }
     for (std::size_t i = 0; i < equals; ++i) {

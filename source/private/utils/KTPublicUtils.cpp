@@ -5,7 +5,9 @@
 #include "IKTStream.h"
 #include "KTAssert.h"
 #include "KTBase64.h"
+#include "KTException.h"
 #include "KTHttpDate.h"
+#include "KTRequireDictionary.h"
 #include "KTStringDictionary.h"
 #include "ODigest.h"
 
@@ -174,8 +176,7 @@ std::string KTPublicUtils::ConstructLogStr(std::string text, float value) {
     return stream.str();
 }
 
-IKTStringDictionary &KTPublicUtils::GetStringDictionary() {
-    KTStringDictionary *const dictionary = KTStringDictionary::GetStringDictionary();
+IKTStringDictionary &KTRequireDictionary(KTStringDictionary *const dictionary) {
     if (dictionary == nullptr) {
         constexpr char kPath[] = "source/private/utils/KTPublicUtils";
         constexpr KTInt32 kLine = 159;
@@ -183,4 +184,8 @@ IKTStringDictionary &KTPublicUtils::GetStringDictionary() {
         throw KTLCException(KTString(kKTErrorInternal), kPath, kLine);
     }
     return *dictionary;
+}
+
+IKTStringDictionary &KTPublicUtils::GetStringDictionary() {
+    return KTRequireDictionary(KTStringDictionary::GetStringDictionary());
 }
