@@ -74,5 +74,6 @@ void AddAnimationBenchmarks();
 void AddDigestBenchmarks();
 void AddStreamBenchmarks();
 void AddExceptionBenchmarks();
+void AddDictionaryBenchmarks();
 
 } // namespace bench

@@ -55,6 +55,7 @@ int main(int argc, char **argv) {
     bench::AddDigestBenchmarks();
     bench::AddStreamBenchmarks();
     bench::AddExceptionBenchmarks();
+    bench::AddDictionaryBenchmarks();
 
     bench::Report report;
     if (benchmark::RunSpecifiedBenchmarks(&report) == 0) {

@@ -14,6 +14,13 @@ using namespace orvik_private;
 
 namespace {
 
+// Entries that overlap may be too much to write, which is said on the standard error: kept for each test as a whole.
+class DictionaryHostileTest : public testing::Test {
+  protected:
+    DictionaryHostileTest() { testing::internal::CaptureStderr(); }
+    ~DictionaryHostileTest() override { testing::internal::GetCapturedStderr(); }
+};
+
 // Reads bytes that end where the allocation ends, looks everything up that is there, and writes it in each form.
 void Exercise(std::string_view bytes, DictionaryReader &dictionary) {
     std::vector<char> const exact(bytes.begin(), bytes.end());
@@ -30,13 +37,11 @@ void Exercise(std::string_view bytes, DictionaryReader &dictionary) {
             EXPECT_EQ(entry.index, dictionary.Array().Find(entry.key));
         }
     });
-    testing::internal::CaptureStderr(); // entries that overlap may be too much to write
     for (DictionaryForm const form :
          {DictionaryForm{true, 0, std::endian::big}, DictionaryForm{true, 1, std::endian::little},
           DictionaryForm{false, 0, std::endian::little}, DictionaryForm{false, 2, std::endian::little}}) {
         WriteBytes(dictionary, form);
     }
-    testing::internal::GetCapturedStderr();
 }
 
 std::string Version15() {
@@ -69,7 +74,7 @@ std::vector<std::string> WholeFiles() {
             "\"$$$/A=x\\n\"\r\n\"/B=#{copy}\"\r\n"};
 }
 
-TEST(DictionaryHostileTest, CutOffAtEveryByte) {
+TEST_F(DictionaryHostileTest, CutOffAtEveryByte) {
     for (std::string const &whole : WholeFiles()) {
         for (std::size_t length = 0; length < whole.size(); ++length) {
             SCOPED_TRACE(length);
@@ -82,7 +87,7 @@ TEST(DictionaryHostileTest, CutOffAtEveryByte) {
     }
 }
 
-TEST(DictionaryHostileTest, EntriesStayWhenOnlyTheBucketsAreCutOff) {
+TEST_F(DictionaryHostileTest, EntriesStayWhenOnlyTheBucketsAreCutOff) {
     std::string const whole = SmallFile().Bytes();
     constexpr std::size_t kLists = 2 * (2 + 4 + 4);
     for (std::size_t length = whole.size() - kLists; length < whole.size(); ++length) {
@@ -97,7 +102,7 @@ TEST(DictionaryHostileTest, EntriesStayWhenOnlyTheBucketsAreCutOff) {
     EXPECT_EQ("", List(dictionary)) << "the texts themselves are cut off";
 }
 
-TEST(DictionaryHostileTest, EveryByteChangedInManyWays) {
+TEST_F(DictionaryHostileTest, EveryByteChangedInManyWays) {
     for (std::string const &whole : WholeFiles()) {
         for (std::size_t at = 0; at < whole.size(); ++at) {
             SCOPED_TRACE(at);
@@ -112,7 +117,7 @@ TEST(DictionaryHostileTest, EveryByteChangedInManyWays) {
 }
 
 // Each 32-bit value at each place: counts near 2^32, offsets just outside.
-TEST(DictionaryHostileTest, EveryFourBytesChanged) {
+TEST_F(DictionaryHostileTest, EveryFourBytesChanged) {
     for (std::string const &whole : WholeFiles()) {
         for (std::size_t at = 21; at + 4 <= whole.size(); ++at) {
             SCOPED_TRACE(at);
@@ -160,7 +165,7 @@ constexpr Corruption kCorruptions[] = {
     {"the first text too long", [](SmallFile &file) { file.valueLengths = {7, 4}; }, ""},
 };
 
-TEST(DictionaryHostileTest, EveryFieldDamaged) {
+TEST_F(DictionaryHostileTest, EveryFieldDamaged) {
     for (Corruption const &corruption : kCorruptions) {
         for (bool const isBig : {false, true}) {
             SCOPED_TRACE(corruption.name);
@@ -186,7 +191,7 @@ TEST(DictionaryHostileTest, EveryFieldDamaged) {
     EXPECT_EQ("", List(dictionary));
 }
 
-TEST(DictionaryHostileTest, RunsMayOverlapAndHaveOddLengths) {
+TEST_F(DictionaryHostileTest, RunsMayOverlapAndHaveOddLengths) {
     SmallFile file;
     file.valueOffsets = {0, 0};
     file.valueLengths = {6, 5};
@@ -200,7 +205,7 @@ TEST(DictionaryHostileTest, RunsMayOverlapAndHaveOddLengths) {
     EXPECT_EQ("/A= /Bc=", List(other));
 }
 
-TEST(DictionaryHostileTest, RunsOfNoBytesMayStandAnywhere) {
+TEST_F(DictionaryHostileTest, RunsOfNoBytesMayStandAnywhere) {
     SmallFile file;
     file.valueOffsets = {0xFFFFFFFF, 0xFFFFFFFE};
     file.valueLengths = {0, 0};
@@ -211,7 +216,7 @@ TEST(DictionaryHostileTest, RunsOfNoBytesMayStandAnywhere) {
 }
 
 // 40,000 entries that all have the same 64 KiB of multibyte text: converted at once they would fill 5 GB.
-TEST(DictionaryHostileTest, OverlappingMultibyteTextsAreConvertedAsTheyAreAskedFor) {
+TEST_F(DictionaryHostileTest, OverlappingMultibyteTextsAreConvertedAsTheyAreAskedFor) {
     constexpr std::uint32_t kEntries = 40'000;
     constexpr std::uint32_t kText = 0xFFFF;
     Fields file = Header(2, 7, 1);
@@ -231,7 +236,7 @@ TEST(DictionaryHostileTest, OverlappingMultibyteTextsAreConvertedAsTheyAreAskedF
     EXPECT_EQ(kText, dictionary.Array().Value(kEntries - 1, scratch).size());
 }
 
-TEST(DictionaryHostileTest, KeysOfOneBucketDoNotSlowLookupsDown) {
+TEST_F(DictionaryHostileTest, KeysOfOneBucketDoNotSlowLookupsDown) {
     // Only bytes that the file's own hash does not look at differ: without the index this would take minutes.
     constexpr int kEntries = 60'000;
     DictionaryReader dictionary;
@@ -251,7 +256,7 @@ TEST(DictionaryHostileTest, KeysOfOneBucketDoNotSlowLookupsDown) {
     EXPECT_EQ(B("\1\0\0\0"), WriteBytes(dictionary).substr(34 + 13, 4)) << "all are in one bucket";
 }
 
-TEST(DictionaryHostileTest, ZerosEverywhere) {
+TEST_F(DictionaryHostileTest, ZerosEverywhere) {
     DictionaryReader dictionary;
     Exercise(std::string(100'000, '\0'), dictionary);
     EXPECT_TRUE(dictionary.IsValid()) << "an empty text";
@@ -286,7 +291,7 @@ class FailingSource final : public ByteSource {
     bool m_Failed = false;
 };
 
-TEST(DictionaryHostileTest, AFailingDeviceClearsTheFlag) {
+TEST_F(DictionaryHostileTest, AFailingDeviceClearsTheFlag) {
     std::string const whole = SmallFile().Bytes();
     DictionaryReader dictionary;
     FailingSource binary(whole.substr(0, whole.size() - 3), whole.size());

@@ -178,7 +178,6 @@ std::string KTPublicUtils::ConstructLogStr(std::string text, float value) {
 
 IKTStringDictionary &KTRequireDictionary(KTStringDictionary *const dictionary) {
     if (dictionary == nullptr) {
-        constexpr char kPath[] = "source/private/utils/KTPublicUtils";
         constexpr KTInt32 kLine = 159;
         KTAssertFailed("KTStringDictionary::GetStringDictionary()", kPath, kLine);
         throw KTLCException(KTString(kKTErrorInternal), kPath, kLine);
