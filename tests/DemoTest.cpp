@@ -184,6 +184,15 @@ TEST_F(Demo, CourseDictionariesStandSideBySide) {
               "Quiz/Failed Noch nicht: bitte noch einmal Not yet: try once more");
 }
 
+TEST_F(Demo, CourseDictionaryIsWrittenInItsBinaryFormAndReadBack) {
+    Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
+    EXPECT_TRUE(outcome.Has("Binary dictionary\n"));
+    EXPECT_EQ(outcome.Row("written to"), "written to the session folder: 1686 bytes");
+    EXPECT_EQ(outcome.Row("texts that are"), "texts that are the same when read back: 19 of 19");
+    EXPECT_EQ(outcome.Row("$$$/Button/Help=Help^T"),
+              "$$$/Button/Help=Help^T #{mdash} \\\"at once\\\" is not there and gives: Help™ — \"at once\"");
+}
+
 TEST_F(Demo, CoursePicturesAreListedWithTheirSizes) {
     Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
     EXPECT_TRUE(outcome.Row("pictures/panorama.png").ends_with(" 3000 x 400"));

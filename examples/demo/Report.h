@@ -20,7 +20,7 @@ std::string ReportTexts(std::vector<TextResult> const &results, ReportLimits con
 /// The files with captions and how long they are.
 std::string ReportCaptions(std::vector<TextResult> const &results);
 
-/// Texts of the first two dictionaries side by side.
+/// Texts of the first two dictionaries side by side, as looked up by their keys (CourseDictionary.h).
 std::string ReportDictionaries(std::vector<TextResult> const &results, ReportLimits const &limits);
 
 /// Pictures with their sizes in pixels, and all other files.

@@ -4,6 +4,7 @@
 #include "CourseAnimation.h"
 #include "CourseCopy.h"
 #include "CourseDigests.h"
+#include "CourseDictionary.h"
 #include "CourseFiles.h"
 #include "CourseProperties.h"
 #include "DocumentReport.h"
@@ -60,6 +61,10 @@ int Run(Console const &console, Options const &options) {
         return Fail(console, log, "did not crash");
     }
     std::vector<TextResult> const results = ReadCourse(folder.files, log);
+    std::vector<TextResult> results = ReadCourse(folder.files, log);
+    std::vector<TextResult *> const languages = ChooseLanguages(results);
+    LookTextsUp(languages);
+    log.Step("languages loaded: " + std::to_string(languages.size()));
 
     ReportLimits limits;
     if (options.all) {
@@ -80,6 +85,7 @@ int Run(Console const &console, Options const &options) {
         CourseDocument document(folder, results);
         console.Print(ReportDocument(document));
         log.Step("saved as one document, read back, compared and cloned");
+        console.Print(ReportBinaryDictionary(languages));
     }
     console.Print(ReportChecks(results));
 
