@@ -46,11 +46,12 @@ bool ByteRunKey::Equals(HashItem const &other) const noexcept {
 std::uint32_t ByteRunKey::HashOf(std::string_view bytes, std::uint32_t modulus) noexcept {
     constexpr std::size_t kSamples = 5;
     std::size_t const step = std::max<std::size_t>(bytes.size() / kSamples, 1);
-    std::uint32_t hash = 0;
+    // At most nine bytes are looked at, so their sum fits, and one division at the end gives what one each would.
+    std::uint64_t hash = 0;
     for (std::size_t at = 0; at < bytes.size(); at += step) {
-        hash = (hash * 32 + static_cast<unsigned char>(bytes[at])) % modulus;
+        hash = hash * 32 + static_cast<unsigned char>(bytes[at]);
     }
-    return hash;
+    return static_cast<std::uint32_t>(hash % modulus);
 }
 
 ByteRunValue::ByteRunValue(std::string_view bytes, bool ownsBytes)

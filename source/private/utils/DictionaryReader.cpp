@@ -4,6 +4,7 @@
 
 #include "DictionaryForms.h"
 #include "DictionaryUnescape.h"
+#include "OUtf.h"
 
 #include <cstdio>
 
@@ -12,16 +13,6 @@ namespace orvik_private {
 namespace {
 
 DictionaryReader *defaultDictionary = nullptr;
-
-// One unit for each byte, sign-extended: what callers' compiled-in defaults have always been taken for.
-KTUnits WidenSigned(std::string_view bytes) {
-    KTUnits units;
-    units.reserve(bytes.size());
-    for (char const byte : bytes) {
-        units.push_back(static_cast<unsigned short>(static_cast<signed char>(byte)));
-    }
-    return units;
-}
 
 // Counts what goes through.
 class CountingSink final : public ByteSink {
@@ -95,22 +86,26 @@ bool DictionaryReader::FindValue(std::string_view name, KTUnits &scratch, UnitsV
     return true;
 }
 
+bool DictionaryReader::LookupName(std::string_view name, KTUnits &scratch, UnitsView &text) const {
+    if (name.empty()) {
+        return false;
+    }
+    DictionaryReader const *const other = defaultDictionary;
+    return FindValue(name, scratch, text) ||
+           (other != nullptr && other != this && other->FindValue(name, scratch, text));
+}
+
 DictionaryFound DictionaryReader::Lookup(std::string_view keyText, KTUnits &scratch, UnitsView &text,
                                          int encoding) const {
     text = {};
     KeyText const key = SplitKeyText(keyText);
-    if (key.name.empty()) {
-        return DictionaryFound::Nothing;
-    }
-    DictionaryReader const *const other = defaultDictionary;
-    if (FindValue(key.name, scratch, text) ||
-        (other != nullptr && other != this && other->FindValue(key.name, scratch, text))) {
+    if (LookupName(key.name, scratch, text)) {
         return DictionaryFound::Entry;
     }
-    if (!key.hasDefault) {
+    if (key.name.empty() || !key.hasDefault) {
         return DictionaryFound::Nothing;
     }
-    scratch = encoding == kEncodingNone ? WidenSigned(key.defaultText) : MultibyteToUnits(encoding, key.defaultText);
+    scratch = encoding == kEncodingNone ? OWidenSigned(key.defaultText) : MultibyteToUnits(encoding, key.defaultText);
     if (MayHaveEscapes(scratch)) {
         scratch = Unescape(scratch);
     }

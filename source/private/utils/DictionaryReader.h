@@ -123,6 +123,9 @@ class DictionaryReader {
     DictionaryFound Lookup(std::string_view keyText, KTUnits &scratch, UnitsView &text,
                            int encoding = kEncodingNone) const;
 
+    /// The first part of that for a name alone: here, then in the default dictionary. False if neither has it.
+    bool LookupName(std::string_view name, KTUnits &scratch, UnitsView &text) const;
+
     FastArray const &Array() const noexcept { return *m_Array; }
     LegacyTable const &Legacy() const noexcept { return m_Legacy; }
 

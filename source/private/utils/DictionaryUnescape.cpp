@@ -155,8 +155,11 @@ CaretTable PlatformCaretTable() noexcept {
 void SetPlatformCaretFlag(bool set) noexcept { platformCaretFlag.store(set, std::memory_order_relaxed); }
 
 bool MayHaveEscapes(UnitsView text) noexcept {
-    return std::any_of(text.begin(), text.end(),
-                       [](unsigned short unit) { return unit == '\\' || unit == '^' || unit == '#'; });
+    bool may = false; // most texts have none, so all units are looked at, several at a time
+    for (unsigned short const unit : text) {
+        may |= unit == '\\' || unit == '^' || unit == '#';
+    }
+    return may;
 }
 
 KTUnits Unescape(UnitsView text, CaretTable table, EscapeProblems const &problems) {

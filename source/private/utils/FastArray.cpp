@@ -5,6 +5,7 @@
 #include "DictionaryBlock.h"
 
 #include <algorithm>
+#include <array>
 #include <limits>
 #include <utility>
 
@@ -124,23 +125,35 @@ void FastArray::Append(std::unique_ptr<DictionaryBlock> block, DictionaryObserve
     m_Blocks.push_back(std::move(block));
     DictionaryBlock const &added = *m_Blocks.back();
     m_EntryTotal += count;
-    for (std::uint32_t position = 0; added.HasKeys() && position < count; ++position) {
-        std::string_view const key = added.Key(position);
-        if (key.empty()) {
-            continue;
+    // A large index is not in the processor's caches: the slots of some keys are fetched while others are hashed.
+    constexpr std::uint32_t kAtOnce = 16;
+    std::array<std::uint32_t, kAtOnce> tags{};
+    for (std::uint32_t first = 0; added.HasKeys() && first < count; first += kAtOnce) {
+        std::uint32_t const end = std::min(count - first, kAtOnce);
+        for (std::uint32_t i = 0; i < end; ++i) {
+            tags[i] = m_Index.TagOf(added.Key(first + i));
+            m_Index.Prefetch(tags[i]);
         }
-        auto const isKey = [&](std::uint32_t entry) { return Key(entry) == key; };
-        std::uint32_t const before = m_Index.Link(m_Index.TagOf(key), added.Base() + position, isKey);
-        if (before == KeyIndex::kNone) {
-            continue;
+        for (std::uint32_t i = 0; i < end; ++i) {
+            LinkEntry(tags[i], added.Base() + first + i, added.Key(first + i), observer);
         }
-        DictionaryBlock &earlier = BlockOf(before);
-        earlier.SetMark(before - earlier.Base(), kDeadMark);
-        m_Replaced.erase(before);
-        ++m_DeadCount;
-        if (observer != nullptr) {
-            observer->OnProblem({DictionaryProblemKind::DuplicateKey, 0, 0, std::string(key), {}});
-        }
+    }
+}
+
+void FastArray::LinkEntry(std::uint32_t tag, std::uint32_t index, std::string_view key, DictionaryObserver *observer) {
+    if (key.empty()) {
+        return;
+    }
+    std::uint32_t const before = m_Index.Link(tag, index, [&](std::uint32_t entry) { return Key(entry) == key; });
+    if (before == KeyIndex::kNone) {
+        return;
+    }
+    DictionaryBlock &earlier = BlockOf(before);
+    earlier.SetMark(before - earlier.Base(), kDeadMark);
+    m_Replaced.erase(before);
+    ++m_DeadCount;
+    if (observer != nullptr) {
+        observer->OnProblem({DictionaryProblemKind::DuplicateKey, 0, 0, std::string(key), {}});
     }
 }
 

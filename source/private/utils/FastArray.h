@@ -110,6 +110,9 @@ class FastArray final : public RefCountObj {
 
     /// Takes a block's entries over and links them; the ones whose keys were there before are reported.
     void Append(std::unique_ptr<DictionaryBlock> block, DictionaryObserver *observer);
+
+    /// Makes a key find the entry; one that it found before is dead then.
+    void LinkEntry(std::uint32_t tag, std::uint32_t index, std::string_view key, DictionaryObserver *observer);
     void AddToSecondTotal(std::uint32_t count) noexcept;
 
     std::vector<std::unique_ptr<DictionaryBlock>> m_Blocks; // by base index

@@ -31,7 +31,9 @@ struct RunTable {
         : offsets(cursor.Take(count * 4, field)), lengths(cursor.Take(count * 2, field)) {}
 };
 
-constexpr std::uint16_t kNoBucket = 0xFFFF;
+// Instead of a key's bucket: a list has had it; it has no bytes.
+constexpr std::uint16_t kListed = 0xFFFF;
+constexpr std::uint16_t kEmptyKey = 0xFFFE;
 
 } // namespace
 
@@ -152,12 +154,14 @@ class DictionaryBlockReader {
     bool ReadLists(bool check) {
         constexpr char kField[] = "the lists of the buckets are cut off";
         std::uint64_t const start = m_Cursor.Position();
-        std::vector<std::uint16_t> bucketOf(check ? m_Count : 0, kNoBucket);
+        std::vector<std::uint16_t> bucketOf(check ? m_Count : 0, kEmptyKey);
         std::uint32_t missing = 0;
         for (std::uint32_t position = 0; position < bucketOf.size(); ++position) {
             std::string_view const key = m_Array.Key(m_First + position);
-            bucketOf[position] = static_cast<std::uint16_t>(ByteRunKey::HashOf(key, kBucketCount));
-            missing += key.empty() ? 0 : 1;
+            if (!key.empty()) {
+                bucketOf[position] = static_cast<std::uint16_t>(ByteRunKey::HashOf(key, kBucketCount));
+                ++missing;
+            }
         }
         unsigned char const *const numbers = m_Cursor.Take(std::uint64_t{m_Head.buckets} * 2, kField);
         unsigned char const *const counts = m_Cursor.Take(std::uint64_t{m_Head.buckets} * 4, kField);
@@ -169,10 +173,12 @@ class DictionaryBlockReader {
             unsigned char const *const indices = m_Cursor.Take(std::uint64_t{count} * 4, kField);
             for (std::size_t i = 0; check && i < count; ++i) {
                 std::uint32_t const position = m_Cursor.U32At(indices + i * 4);
-                if (position >= bucketOf.size() || std::exchange(bucketOf[position], kNoBucket) != bucket) {
-                    isRight = false;
+                std::uint16_t const wanted = position < bucketOf.size() ? bucketOf[position] : kListed;
+                if (wanted == bucket) {
+                    bucketOf[position] = kListed;
+                    --missing;
                 } else {
-                    missing -= m_Array.Key(m_First + position).empty() ? 0 : 1;
+                    isRight = isRight && wanted == kEmptyKey; // in whatever list
                 }
             }
         }

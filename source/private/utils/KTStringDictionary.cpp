@@ -15,22 +15,25 @@ using orvik_private::UnitsView;
 
 namespace {
 
+// Copies units as bytes and tells whether all of them are ASCII. Apart, as a loop that is compiled where nothing has to
+// be cleaned up is compiled to several units at a time.
+bool NarrowAscii(unsigned short const *units, std::size_t count, char *bytes) noexcept {
+    unsigned all = 0;
+    for (std::size_t i = 0; i < count; ++i) {
+        all |= units[i];
+        bytes[i] = static_cast<char>(units[i]);
+    }
+    return all < 0x80;
+}
+
 // A key as UTF-8. Keys are ASCII and short nearly always, and are looked up all the time, so such ones need no memory.
 class KeyBytes {
   public:
     explicit KeyBytes(KTString const &key) {
-        unsigned short const *const units = key.c_str();
         std::size_t const count = key.size();
-        if (count <= m_Short.size()) {
-            unsigned all = 0;
-            for (std::size_t i = 0; i < count; ++i) {
-                all |= units[i];
-                m_Short[i] = static_cast<char>(units[i]);
-            }
-            if (all < 0x80) {
-                m_Bytes = {m_Short.data(), count};
-                return;
-            }
+        if (count <= m_Short.size() && NarrowAscii(key.c_str(), count, m_Short.data())) {
+            m_Bytes = {m_Short.data(), count};
+            return;
         }
         m_Long = key.GetUTF8String();
         m_Bytes = m_Long;
@@ -48,6 +51,27 @@ class KeyBytes {
 };
 
 UnitsView ViewOf(KTString const &text) { return {text.c_str(), text.size()}; }
+
+// Whether a default is nothing but its bytes: no escape, no zero. Most are, and need not be converted twice.
+bool IsPlain(std::string_view text) noexcept {
+    bool isPlain = true;
+    for (char const byte : text) {
+        isPlain &= byte != '\\' && byte != '^' && byte != '#' && byte != 0;
+    }
+    return isPlain;
+}
+
+// One unit for each byte, sign-extended, behind what `target` holds.
+void WidenSigned(std::string_view bytes, KTString &target) {
+    if (bytes.empty()) {
+        return;
+    }
+    target.append(bytes.size(), 0);
+    unsigned short *const units = &target[target.size() - bytes.size()];
+    for (std::size_t i = 0; i < bytes.size(); ++i) {
+        units[i] = static_cast<unsigned short>(static_cast<signed char>(bytes[i]));
+    }
+}
 
 // The text up to its first zero.
 UnitsView UpToZero(UnitsView text) {
@@ -121,9 +145,17 @@ KTString KTStringDictionary::GetKeyValue(KTString const &key) {
     if (m_Dictionary == nullptr) {
         return result;
     }
+    KeyBytes const bytes(key);
+    orvik_private::KeyText const parts = orvik_private::SplitKeyText(bytes.Get());
     KTUnits scratch;
     UnitsView text;
-    m_Dictionary->Lookup(KeyBytes(key).Get(), scratch, text);
+    if (!m_Dictionary->LookupName(parts.name, scratch, text)) {
+        if (!parts.name.empty() && IsPlain(parts.defaultText)) {
+            WidenSigned(parts.defaultText, result);
+            return result;
+        }
+        m_Dictionary->Lookup(bytes.Get(), scratch, text);
+    }
     text = UpToZero(text);
     result.append(text.data(), text.size());
     return result;
