@@ -5,10 +5,12 @@
 // written down here and not derived from the headers.
 
 #include "KTPublic.h"
+#include "MailDictionary.h"
 #include "VTable.h"
 
 #include <gtest/gtest.h>
 
+#include <memory>
 #include <new>
 #include <utility>
 
@@ -21,6 +23,8 @@ VTableRow const kTables[] = {
         {"pure", "pure", "KTLogger::Log(std::string const&)", "KTLogger::Log(char const*, ...)", "pure ~"}),
     VTableOf<WKTLogger>({"WKTLogger::Log(std::wstring const&)", "WKTLogger::Log(wchar_t const*, ...)",
                          "WKTLogger::Log(std::string const&)", "KTLogger::Log(char const*, ...)", "~"}),
+    VTableOf<KTSendMail>({"pure", "pure ~"}),
+    VTableOf<WKTSendMail>({"WKTSendMail::SendMail()", "~"}),
     VTableOf<KTPath>({"~"}),
     VTableOf<KTTime>({"~"}),
     VTableOf<KTDuration>({"~", "KTDuration::GetTime() const", "KTDuration::GetTimeInDeciSeconds() const",
@@ -292,6 +296,14 @@ TEST(AbiTest, ObjectsPointToTheLibrarysTables) {
     EXPECT_EQ(ExportedTable<KTScrapDataFlavor>(), TableOfObject(&flavor));
     EXPECT_EQ(ExportedTable<WKTLogger>(), TableOfObject(gKTLogger));
     EXPECT_EQ(ExportedTable<WKTExceptionUtils>(), TableOfObject(&KTExceptionUtils::GetInstance()));
+}
+
+TEST(AbiTest, SendingIsTheMailSendersFirstSlot) {
+    MailDictionary dictionary;
+    std::unique_ptr<KTSendMail> const mail(KTSendMail::GetSendMailHandler(dictionary));
+    EXPECT_EQ(ExportedTable<WKTSendMail>(), TableOfObject(mail.get()));
+    EXPECT_EQ(0U, EntryOf(&KTSendMail::SendMail));
+    EXPECT_EQ(0U, EntryOf(&WKTSendMail::SendMail));
 }
 
 // The header's declarations give hosts' calls their entries, so they must count as the library does.

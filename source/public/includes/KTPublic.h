@@ -41,6 +41,7 @@
 #include "KTScrapDataFlavor.h"
 #include "KTShortCut.h"
 #include "KTStreamUtil.h"
+#include "KTSendMail.h"
 #include "KTString.h"
 #include "KTStringDictionary.h"
 #include "KTSystemUtils.h"
@@ -57,3 +58,4 @@
 #include "WKTExceptionUtils.h"
 #include "TempFileXferBytes.h"
 #include "WKTLogger.h"
+#include "WKTSendMail.h"
