@@ -278,6 +278,20 @@ TEST_F(Demo, EveryFileHasItsDigest) {
     EXPECT_EQ(outcome.Row("sub/abc.txt"),
               "sub/abc.txt ba7816bf8f01cfea414140de5dae2223b00361a396177a9cb410ff61f20015ad");
     EXPECT_EQ(outcome.Row("used.txt"), "used.txt in use");
+TEST_F(Demo, MailProgramIsNamedAndNotUsed) {
+    constexpr wchar_t kClients[] = L"Software\\Clients\\Mail";
+    wchar_t name[256] = {};
+    DWORD size = sizeof name;
+    RegGetValueW(HKEY_LOCAL_MACHINE, kClients, nullptr, RRF_RT_REG_SZ, nullptr, name, &size);
+    if (std::wstring(name).empty() || RegSetValueW(HKEY_LOCAL_MACHINE, kClients, REG_SZ, name, 0) != ERROR_SUCCESS) {
+        GTEST_SKIP() << "there is no mail program, or it may not be changed";
+    }
+    Outcome const with = Run(L"\"" KT_COURSE L"\"");
+    RegSetValueW(HKEY_LOCAL_MACHINE, kClients, REG_SZ, L"", 0);
+    Outcome const without = Run(L"\"" KT_COURSE L"\"");
+    RegSetValueW(HKEY_LOCAL_MACHINE, kClients, REG_SZ, name, 0);
+    EXPECT_TRUE(with.Has("\nMail\n  the course would be sent by: " + fs::path(name).string() + "\n\n")) << with.out;
+    EXPECT_TRUE(without.Has("\nMail\n  not sent: No mail program is set up on this machine.\n\n")) << without.out;
 }
 
 TEST_F(Demo, CourseChecksAllHold) {

@@ -8,6 +8,7 @@
 #include "CourseFiles.h"
 #include "CourseProperties.h"
 #include "DocumentReport.h"
+#include "CourseMail.h"
 #include "Options.h"
 #include "ReadCourse.h"
 #include "Report.h"
@@ -87,6 +88,7 @@ int Run(Console const &console, Options const &options) {
         log.Step("saved as one document, read back, compared and cloned");
         console.Print(ReportBinaryDictionary(languages));
     }
+    console.Print(ReportMail());
     console.Print(ReportChecks(results));
 
     bool const anyRead = std::any_of(results.begin(), results.end(), [](auto const &result) { return result.isRead; });
