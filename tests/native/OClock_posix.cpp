@@ -2,6 +2,9 @@
 
 #include "OClock.h"
 
+#include "OTestClock.h"
+
+#include <atomic>
 #include <chrono>
 #include <cstdio>
 #include <ctime>
@@ -24,6 +27,9 @@ KTUInt64 OffsetNow() {
 
 bool IsWithin(int value, int least, int greatest) { return value >= least && value <= greatest; }
 
+// The time that a test has set; 0 while the system's clock counts.
+std::atomic<KTUInt64> testClock{0};
+
 KTUnits Widen(std::string const &text) { return {text.begin(), text.end()}; }
 
 } // namespace
@@ -31,6 +37,14 @@ KTUnits Widen(std::string const &text) { return {text.begin(), text.end()}; }
 KTUInt64 OSystemTimeNow() {
     auto const since = std::chrono::time_point_cast<Counts>(std::chrono::system_clock::now()) - kBegin;
     return static_cast<KTUInt64>(Counts(since).count());
+}
+
+void OSetTestClock(KTUInt64 microseconds) { testClock = microseconds; }
+
+KTUInt64 OUtcMicroseconds() {
+    KTUInt64 const set = testClock;
+    auto const now = std::chrono::system_clock::now().time_since_epoch();
+    return set != 0 ? set : static_cast<KTUInt64>(std::chrono::duration_cast<std::chrono::microseconds>(now).count());
 }
 
 bool OCalendarToCount(OCalendarTime const &fields, KTUInt64 &count) {

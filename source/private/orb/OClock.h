@@ -23,6 +23,11 @@ struct OCalendarTime {
 /// The UTC time now. Any thread.
 KTUInt64 OSystemTimeNow();
 
+/// The UTC time now in whole microseconds since 1970-01-01 00:00. Every clock of the library that measures time spans
+/// reads it, so tests drive them all here: on Windows by replacing GetSystemTimeAsFileTime in the library's import table,
+/// natively through the stand-in (tests/support/TestClock.h does either). Any thread.
+KTUInt64 OUtcMicroseconds();
+
 /// The count of these fields, the weekday ignored. False, with `count` unchanged, when there is no such time. Any thread.
 bool OCalendarToCount(OCalendarTime const &fields, KTUInt64 &count);
 

@@ -11,6 +11,9 @@ namespace {
 
 constexpr int kTextSize = 256; // wide characters, the terminating zero included
 
+constexpr KTUInt64 kCountOf1970 = 116'444'736'000'000'000;
+constexpr KTUInt64 kCountsPerMicrosecond = 10;
+
 KTUInt64 ToCount(FILETIME const &time) {
     return (static_cast<KTUInt64>(time.dwHighDateTime) << 32) | time.dwLowDateTime;
 }
@@ -63,6 +66,8 @@ KTUInt64 OSystemTimeNow() {
     GetSystemTimeAsFileTime(&now);
     return ToCount(now);
 }
+
+KTUInt64 OUtcMicroseconds() { return (OSystemTimeNow() - kCountOf1970) / kCountsPerMicrosecond; }
 
 bool OCalendarToCount(OCalendarTime const &fields, KTUInt64 &count) {
     SYSTEMTIME time{};

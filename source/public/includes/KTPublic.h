@@ -46,6 +46,7 @@
 #include "KTStringDictionary.h"
 #include "KTSystemUtils.h"
 #include "KTTempFileHolder.h"
+#include "KTTickCount.h"
 #include "KTTime.h"
 #include "KTTypes.h"
 #include "KTUnitTraits.h"
