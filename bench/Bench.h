@@ -75,5 +75,6 @@ void AddDigestBenchmarks();
 void AddStreamBenchmarks();
 void AddExceptionBenchmarks();
 void AddDictionaryBenchmarks();
+void AddThreadBenchmarks();
 
 } // namespace bench

@@ -56,6 +56,7 @@ int main(int argc, char **argv) {
     bench::AddStreamBenchmarks();
     bench::AddExceptionBenchmarks();
     bench::AddDictionaryBenchmarks();
+    bench::AddThreadBenchmarks();
 
     bench::Report report;
     if (benchmark::RunSpecifiedBenchmarks(&report) == 0) {

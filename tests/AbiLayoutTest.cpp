@@ -11,6 +11,11 @@
 //         24  KTMutex
 //         40  KTPath           the log file's path, up to 80
 //
+//     KTThread, KTWorkerThread, 16 bytes      KTThreadMsg, 40 bytes     KTCallBack, 32 bytes
+//          0  virtual table                        0  i32  message           0  i32   kind
+//          8  the owned implementation object      8  u64  param1 to 4       8  u64   two
+//                                                                           24  void*
+//
 //     KTTime, 16 bytes             KTDuration, 24 bytes
 //          0  virtual table             0  virtual table
 //          8  u64  count                8  KTReal  amount
@@ -273,6 +278,38 @@ TEST(AbiLayoutTest, NumbersAreFixed) {
     EXPECT_EQ(7, static_cast<int>(KTRect::kLastPoint));
     EXPECT_EQ(8, static_cast<int>(KTRect::kCenter));
     EXPECT_EQ(4U, sizeof(KTRect::RefPoint));
+TEST(AbiLayoutTest, ThreadsAndTheirMessagesHaveTheirFieldsInOrder) {
+    EXPECT_EQ(16U, sizeof(KTThread));
+    EXPECT_EQ(16U, sizeof(KTWorkerThread));
+    EXPECT_EQ(40U, sizeof(KTThreadMsg));
+    KTThreadMsg const msg{static_cast<KT_THREAD_MESSAGE>(0x01020304), 1, 2, 3, 4};
+    EXPECT_EQ(0x01020304, ValueAt<int>(&msg, 0));
+    for (KTUInt64 i = 1; i <= 4; ++i) {
+        EXPECT_EQ(i, ValueAt<KTUInt64>(&msg, 8 * i));
+    }
+    KTStateMachine const state(0x01020304);
+    EXPECT_EQ(16U, sizeof(KTStateMachine));
+    EXPECT_EQ(0x01020304, ValueAt<int>(&state, 8));
+    EXPECT_EQ(8U, sizeof(KTSimpleTimeKeeper));
+
+    KTCallBack const callBack(static_cast<KTCallBackEnum>(0x01020304));
+    EXPECT_EQ(32U, sizeof(KTCallBack));
+    EXPECT_EQ(0x01020304, ValueAt<int>(&callBack, 0));
+    EXPECT_EQ(0U, ValueAt<KTUInt64>(&callBack, 8));
+    EXPECT_EQ(0U, ValueAt<KTUInt64>(&callBack, 16));
+    EXPECT_EQ(nullptr, PointerAt(&callBack, 24));
+}
+
+TEST(AbiLayoutTest, NumbersAreFixed) {
+    EXPECT_EQ(14, static_cast<int>(KT_THREAD_MSG_QUIT));
+    EXPECT_EQ(4U, sizeof(KT_THREAD_MESSAGE));
+    EXPECT_EQ(0, static_cast<int>(kKTThreadPriorityLowest));
+    EXPECT_EQ(1, static_cast<int>(kKTThreadPriorityBelowNormal));
+    EXPECT_EQ(2, static_cast<int>(kKTThreadPriorityUnchanged));
+    EXPECT_EQ(3, static_cast<int>(kKTThreadPriorityAboveNormal));
+    EXPECT_EQ(4, static_cast<int>(kKTThreadPriorityHighest));
+    EXPECT_EQ(4U, sizeof(KTThreadPriorityEnum));
+    EXPECT_EQ(4U, sizeof(KTCallBackEnum));
     EXPECT_EQ(0, static_cast<int>(kKTDurationSeconds));
     EXPECT_EQ(4U, sizeof(KTDurationUnitOfMeasure));
     EXPECT_EQ(0, static_cast<int>(kKTErrorNone));

@@ -213,6 +213,12 @@ VTableRow const kTables[] = {
     VTableOf<WKTExceptionUtils>({"~", "WKTExceptionUtils::InstallExceptionHandlerImpl()",
                                  "WKTExceptionUtils::DefaultHandler(KTException const&)",
                                  "WKTExceptionUtils::RestorePreviousHandler() const"}),
+    VTableOf<KTThread>({"pure ~",
+                        "KTThread::flushMessageQueueAndSyncPostMessage(KT_THREAD_MESSAGE, unsigned long long, unsigned "
+                        "long long, unsigned long long, unsigned long long)",
+                        "pure"}),
+    VTableOf<KTWorkerThread>({"pure ~", "pure"}),
+    VTableOf<KTStateMachine>({"KTStateMachine::Get() const", "KTStateMachine::Validate(int) const", "~"}),
 };
 
 constexpr std::size_t kCompleteDestructor = 0; // entries of a class whose first slot is its destructor

@@ -6,6 +6,7 @@
 
 #include "WODebugOutput.h"
 
+#include "ODebugText.h"
 #include "WOHandle.h"
 
 #include <atomic>
@@ -36,3 +37,5 @@ void WODebugOutput(std::wstring const &text) noexcept {
     OutputDebugStringW(text.c_str());
     OutputDebugStringW(L"\n");
 }
+
+void ODebugText(char const *text) noexcept { OutputDebugStringA(text); }
