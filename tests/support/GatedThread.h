@@ -94,7 +94,13 @@ class GatedThread : public KTThread {
         return m_Messages;
     }
 
-    /// The same, as their first parameters.
+    /// The last of them. REQUIRES: there is one.
+    KTThreadMsg LastMessage() {
+        std::lock_guard const lock(m_Mutex);
+        return m_Messages.back();
+    }
+
+    /// All of them, as their first parameters.
     std::vector<KTUInt64> Numbers() {
         std::vector<KTUInt64> numbers;
         for (KTThreadMsg const &msg : Messages()) {
