@@ -31,6 +31,7 @@ usage: ./kt COMMAND
   bench [FILTER [ARGS]] the benchmarks beside their peers; the page is build/bench/index.html; the arguments go to
                         Google Benchmark
   sanitize              the portable half natively under ASan and UBSan, then under TSan
+  soak [SECONDS]        message threads under load for that long (300), looking for losses, standstill and leaks
   fuzz SECONDS          every fuzz target for that long
   lint                  clang-format and clang-tidy over all sources
   install PREFIX        DLL, headers, CMake package, tools and licence notes
@@ -278,6 +279,15 @@ command_sanitize() {
     done
 }
 
+command_soak() {
+    local seconds=${1:-300} temp=$root/build/soak
+    [[ $seconds =~ ^[1-9][0-9]*$ ]] || fail "usage: ./kt soak [SECONDS]"
+    need_build_tools
+    configure windows
+    compile windows ktsoak ktlaunch
+    "$root/cmake/wine-run" --temp "$temp" "$root/build/windows/bin/ktsoak.exe" "$seconds"
+}
+
 command_fuzz() {
     local seconds=${1:-} target
     [[ $seconds =~ ^[0-9]+$ ]] || fail "usage: ./kt fuzz SECONDS"
@@ -317,7 +327,7 @@ main() {
     [ $# = 0 ] || shift
     case $command in
     crash-campaign) command_crash_campaign "$@" ;;
-    demo | test | run | bench | sanitize | fuzz | lint | install) "command_$command" "$@" ;;
+    demo | test | run | bench | sanitize | soak | fuzz | lint | install) "command_$command" "$@" ;;
     build) build ;;
     help | -h | --help) usage ;;
     *)

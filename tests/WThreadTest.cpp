@@ -6,6 +6,7 @@
 #include "KTSimpleTimeKeeper.h"
 #include "KTWorkerThread.h"
 #include "WChildProcess.h"
+#include "WHandleCount.h"
 #include "WImportHook.h"
 
 #include <gtest/gtest.h>
@@ -53,12 +54,6 @@ class PriorityTest : public testing::TestWithParam<PriorityRow> {
   private:
     WImportHook m_Hook{kLibrary, "SetThreadPriority", WatchSetThreadPriority};
 };
-
-DWORD HandleCount() {
-    DWORD count = 0;
-    GetProcessHandleCount(GetCurrentProcess(), &count);
-    return count;
-}
 
 void RunOneThread() {
     GatedThread thread;
@@ -156,11 +151,12 @@ TEST(WThread, TheDefaultPriorityIsTheThreadsOwn) {
 
 TEST(WThread, LeavesNoHandleBehind) {
     RunOneThread();
-    DWORD const before = HandleCount();
+    std::size_t const before = CountHandles();
+    ASSERT_LT(0U, before);
     for (int i = 0; i < 30; ++i) {
         RunOneThread();
     }
-    EXPECT_EQ(before, HandleCount());
+    EXPECT_EQ(before, CountHandles());
 }
 
 TEST(WThread, PostingAndTakingAllocateNothing) {
