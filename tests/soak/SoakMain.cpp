@@ -4,6 +4,7 @@
 // The exit status is 0 when nothing was lost that the rules do not lose, nothing came to a standstill, and the process
 // holds no more handles, threads and memory than after its first rounds.
 
+#include "KTThread.h"
 #include "MessageSoak.h"
 #include "ProcessFigures.h"
 
@@ -37,7 +38,7 @@ class Watchdog {
   private:
     void Watch() {
         std::uint64_t last = 0;
-        for (int idle = 0; !m_Stop; boost::this_thread::sleep_for(boost::chrono::milliseconds(100))) {
+        for (int idle = 0; !m_Stop; KTSleepForDuration(0, 100)) {
             std::uint64_t const now = soakProgress;
             idle = now == last ? idle + 1 : 0;
             last = now;
