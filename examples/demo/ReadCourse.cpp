@@ -1,15 +1,14 @@
-// ReadCourse.cpp: the threads that read a course.
+// ReadCourse.cpp: the message threads that read a course.
 
 #include "ReadCourse.h"
 
+#include "KTThread.h"
 #include "Table.h"
 #include "TextReader.h"
 #include "WDisk.h"
-#include "WorkQueue.h"
-
-#include <boost/thread/thread.hpp>
 
 #include <algorithm>
+#include <exception>
 #include <new>
 
 namespace {
@@ -54,46 +53,64 @@ void ReadText(TextResult &result, int worker, RunLog &log) {
     result.isRead = true;
 }
 
-// Threads that read until the queue is closed and empty. The end of the object closes it and waits for them.
-class Workers {
+// The messages of a reader, besides the library's quit message.
+constexpr auto kBegin = static_cast<KT_THREAD_MESSAGE>(100);
+constexpr auto kReadFile = static_cast<KT_THREAD_MESSAGE>(101); // param1: the index of the result
+constexpr auto kAllPosted = static_cast<KT_THREAD_MESSAGE>(102);
+
+// A message thread that reads the files it is told to. The end of the object ends the thread, in the order a host must
+// keep: quit message, join, and only then is what the thread uses destroyed.
+class Reader : public KTThread {
   public:
-    Workers(std::vector<TextResult> &results, RunLog &log) : m_Results(results), m_Log(log) {}
-    Workers(Workers const &) = delete;
-    Workers &operator=(Workers const &) = delete;
-    // A queue that could not be closed would never let its threads end: then the process ends instead.
-    ~Workers() { // NOLINT(bugprone-exception-escape)
-        m_Queue.Close();
-        m_Threads.join_all();
+    Reader(int worker, std::vector<TextResult> &results, RunLog &log)
+        : m_Worker(worker), m_Results(results), m_Log(log) {
+        start();
+        postMessage(kBegin, 0, 0, 0, 0);
+    }
+    Reader(Reader const &) = delete;
+    Reader &operator=(Reader const &) = delete;
+    ~Reader() override {
+        postMessage(KT_THREAD_MSG_QUIT, 0, 0, 0, 0);
+        join();
     }
 
-    void Start(int count) {
-        for (int worker = 1; worker <= count; ++worker) {
-            m_Threads.create_thread([this, worker] { Run(worker); });
+    // Waits for room where too many files wait already.
+    void Read(std::size_t index) {
+        while (!postMessage(kReadFile, index, 0, 0, 0)) {
+            KTSleepForDuration(0, 1);
         }
     }
 
-    void Push(std::size_t index) { m_Queue.Push(index); }
+    // Messages are handled in their order, so all files have been read when this one has been handled.
+    void WaitUntilAllAreRead() { syncPostMessage(kAllPosted, 0, 0, 0, 0); }
+
+    void processMessage(KTThreadMsg const &msg) override {
+        if (msg.message == kBegin) {
+            m_Log.WorkerStarted(m_Worker);
+        } else if (msg.message == kReadFile) {
+            ReadOne(m_Results[msg.param1]);
+        } else if (msg.message == KT_THREAD_MSG_QUIT) {
+            m_Log.WorkerEnded(m_Worker, m_Files);
+        }
+    }
 
   private:
-    void Run(int worker) {
-        int files = 0;
-        m_Log.WorkerStarted(worker);
-        while (std::optional<std::size_t> const index = m_Queue.Pop()) {
-            TextResult &result = m_Results[*index];
-            try {
-                ReadText(result, worker, m_Log);
-                ++files;
-            } catch (std::bad_alloc const &) {
-                result.notes.emplace_back("too large for the memory");
-            }
+    // What left this function would end the thread, and with it the program.
+    void ReadOne(TextResult &result) {
+        try {
+            ReadText(result, m_Worker, m_Log);
+            ++m_Files;
+        } catch (std::bad_alloc const &) {
+            result.notes.emplace_back("too large for the memory");
+        } catch (std::exception const &problem) {
+            result.notes.emplace_back(problem.what());
         }
-        m_Log.WorkerEnded(worker, files);
     }
 
-    std::vector<TextResult> &m_Results; // each worker writes to the ones it took from the queue only
+    int m_Worker;
+    std::vector<TextResult> &m_Results; // each reader writes to the ones it was told to only
     RunLog &m_Log;
-    WorkQueue<std::size_t> m_Queue;
-    boost::thread_group m_Threads;
+    int m_Files = 0;
 };
 
 } // namespace
@@ -105,15 +122,15 @@ std::vector<TextResult> ReadCourse(std::vector<CourseFile> const &files, RunLog 
             results.emplace_back().file = file;
         }
     }
-    // Two threads even on one core, so that every run shows them at work; few, as each may hold a large file.
-    constexpr unsigned kFewest = 2;
-    constexpr unsigned kMost = 3;
+    // Two, as each may hold a large file; they read every other file each.
     {
-        Workers workers(results, log);
-        workers.Start(static_cast<int>(std::clamp(boost::thread::hardware_concurrency(), kFewest, kMost)));
+        Reader first(1, results, log);
+        Reader second(2, results, log);
         for (std::size_t index = 0; index < results.size(); ++index) {
-            workers.Push(index);
+            (index % 2 == 0 ? first : second).Read(index);
         }
-    } // all are read here
+        first.WaitUntilAllAreRead();
+        second.WaitUntilAllAreRead();
+    } // both threads have ended here
     return results;
 }

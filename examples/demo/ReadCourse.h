@@ -1,4 +1,4 @@
-// ReadCourse.h: reads a course's text files with several threads.
+// ReadCourse.h: reads a course's text files with two message threads.
 
 #pragma once
 
