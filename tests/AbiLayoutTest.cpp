@@ -268,16 +268,6 @@ TEST(AbiLayoutTest, ExceptionUtilsHaveTheirFieldsInOrder) {
     EXPECT_EQ(static_cast<void *>(&handler), PointerAt(&utils, 16));
 }
 
-TEST(AbiLayoutTest, NumbersAreFixed) {
-    EXPECT_EQ(0, static_cast<int>(kKTInterpolationLinear));
-    EXPECT_EQ(1, static_cast<int>(kKTInterpolationEaseInEaseOut));
-    EXPECT_EQ(4U, sizeof(KTInterpolationModeEnum));
-    EXPECT_EQ(0, static_cast<int>(KTColor::kColorSpaceRGB));
-    EXPECT_EQ(4U, sizeof(KTColor::ColorSpaceEnum));
-    EXPECT_EQ(0, static_cast<int>(KTRect::kFirstPoint));
-    EXPECT_EQ(7, static_cast<int>(KTRect::kLastPoint));
-    EXPECT_EQ(8, static_cast<int>(KTRect::kCenter));
-    EXPECT_EQ(4U, sizeof(KTRect::RefPoint));
 TEST(AbiLayoutTest, ThreadsAndTheirMessagesHaveTheirFieldsInOrder) {
     EXPECT_EQ(16U, sizeof(KTThread));
     EXPECT_EQ(16U, sizeof(KTWorkerThread));
@@ -301,6 +291,15 @@ TEST(AbiLayoutTest, ThreadsAndTheirMessagesHaveTheirFieldsInOrder) {
 }
 
 TEST(AbiLayoutTest, NumbersAreFixed) {
+    EXPECT_EQ(0, static_cast<int>(kKTInterpolationLinear));
+    EXPECT_EQ(1, static_cast<int>(kKTInterpolationEaseInEaseOut));
+    EXPECT_EQ(4U, sizeof(KTInterpolationModeEnum));
+    EXPECT_EQ(0, static_cast<int>(KTColor::kColorSpaceRGB));
+    EXPECT_EQ(4U, sizeof(KTColor::ColorSpaceEnum));
+    EXPECT_EQ(0, static_cast<int>(KTRect::kFirstPoint));
+    EXPECT_EQ(7, static_cast<int>(KTRect::kLastPoint));
+    EXPECT_EQ(8, static_cast<int>(KTRect::kCenter));
+    EXPECT_EQ(4U, sizeof(KTRect::RefPoint));
     EXPECT_EQ(14, static_cast<int>(KT_THREAD_MSG_QUIT));
     EXPECT_EQ(4U, sizeof(KT_THREAD_MESSAGE));
     EXPECT_EQ(0, static_cast<int>(kKTThreadPriorityLowest));
