@@ -33,6 +33,12 @@
 //     KTPlanef: KTVector3f normal, f32 d       KTMatrix4x4f: 16 f32, column by column
 //     KTQuad3D: KTVector3f bottom left, bottom right, top right, top left
 //     KTTransform: KTMatrix4x4f, KTColor4f     KTKeyframe: KTTransform, i32 frame
+//
+//     KTSmbUrl, 128 bytes          KTSMBConnector, 40 bytes
+//          0  KTString  share           0  KTString  URL
+//         32  KTString  path           32  bool      the connection failed
+//         64  KTString  authority
+//         96  KTString  scheme
 
 //     KTException, KTFatalException, KTNonFatalException, 48 bytes      KTLCException, 80 bytes
 //          0  virtual table                                                  0  virtual table
@@ -288,6 +294,25 @@ TEST(AbiLayoutTest, ThreadsAndTheirMessagesHaveTheirFieldsInOrder) {
     EXPECT_EQ(0U, ValueAt<KTUInt64>(&callBack, 8));
     EXPECT_EQ(0U, ValueAt<KTUInt64>(&callBack, 16));
     EXPECT_EQ(nullptr, PointerAt(&callBack, 24));
+}
+
+// No virtual table: the first field stands at the beginning.
+TEST(AbiLayoutTest, ShareUrlsAndConnectorsHaveTheirFieldsInOrder) {
+    KTSmbUrl const url("smb://server/share/path");
+    auto const *const bytes = reinterpret_cast<std::byte const *>(&url);
+    EXPECT_EQ(4 * sizeof(KTString), sizeof(KTSmbUrl));
+    EXPECT_EQ(static_cast<void const *>(bytes), &url.getShare());
+    EXPECT_EQ(static_cast<void const *>(bytes + sizeof(KTString)), &url.getSmbPath());
+    EXPECT_EQ(static_cast<void const *>(bytes + 2 * sizeof(KTString)), &url.getAuthority());
+    EXPECT_EQ(static_cast<void const *>(bytes + 3 * sizeof(KTString)), &url.getScheme());
+
+    KTSMBConnector connector;
+    EXPECT_EQ(sizeof(KTString) + 8, sizeof(KTSMBConnector));
+    connector.connect("smb://no share");
+    EXPECT_EQ(std::byte{1}, reinterpret_cast<std::byte const *>(&connector)[sizeof(KTString)]);
+    auto const *const kept = reinterpret_cast<KTString const *>(&connector);
+    EXPECT_EQ(KTString("smb://no share"), *kept);
+    EXPECT_FALSE(std::is_polymorphic_v<KTSmbUrl> || std::is_polymorphic_v<KTSMBConnector>);
 }
 
 TEST(AbiLayoutTest, NumbersAreFixed) {

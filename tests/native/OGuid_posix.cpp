@@ -2,15 +2,17 @@
 
 #include "OGuid.h"
 
+#include <algorithm>
 #include <fstream>
 #include <string>
 
-OGuidResult OMakeGuid(KTUnits &text) {
+OGuidResult OMakeGuid(OGuidText &text) {
     std::ifstream file("/proc/sys/kernel/random/uuid");
     std::string line;
-    if (!std::getline(file, line)) {
+    if (!std::getline(file, line) || line.size() + 1 != text.size()) {
         return OGuidResult::kNotGenerated;
     }
-    text.assign(line.begin(), line.end());
+    std::copy(line.begin(), line.end(), text.begin());
+    text.back() = 0;
     return OGuidResult::kMade;
 }

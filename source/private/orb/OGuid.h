@@ -2,7 +2,7 @@
 
 #pragma once
 
-#include "KTUnitTraits.h"
+#include <array>
 
 /// What became of a new identifier.
 enum class OGuidResult {
@@ -11,6 +11,9 @@ enum class OGuidResult {
     kNotWritten,   ///< the system made one but could not write it as text
 };
 
+/// An identifier's text and the zero behind it.
+using OGuidText = std::array<unsigned short, 36 + 1>;
+
 /// Makes an identifier and writes it to `text` as the system does: hexadecimal groups of 8, 4, 4, 4 and 12 digits joined
-/// by hyphens. `text` is left alone unless the result is kMade. Throws std::bad_alloc. Any thread.
-OGuidResult OMakeGuid(KTUnits &text);
+/// by hyphens. `text` is left alone unless the result is kMade. Throws nothing. Any thread.
+OGuidResult OMakeGuid(OGuidText &text);

@@ -6,12 +6,9 @@
 
 #include <rpc.h>
 
-#include <array>
-#include <cstddef>
+#include <algorithm>
 
 namespace {
-
-constexpr std::size_t kLength = 36; // 32 digits and 4 hyphens
 
 // The text that the library allocated for an identifier, freed by the library.
 class RpcText {
@@ -41,7 +38,7 @@ bool Generate(UUID &id) {
 
 } // namespace
 
-OGuidResult OMakeGuid(KTUnits &text) {
+OGuidResult OMakeGuid(OGuidText &text) {
     UUID id{};
     if (!Generate(id)) {
         return OGuidResult::kNotGenerated;
@@ -50,12 +47,7 @@ OGuidResult OMakeGuid(KTUnits &text) {
     if (!systemText.Write(id)) {
         return OGuidResult::kNotWritten;
     }
-    std::array<unsigned short, kLength + 1> buffer{};
-    std::size_t length = 0;
-    while (length < kLength && systemText.Get()[length] != 0) {
-        buffer[length] = systemText.Get()[length];
-        ++length;
-    }
-    text.assign(buffer.data(), length);
+    std::copy_n(systemText.Get(), text.size(), text.begin());
+    text.back() = 0;
     return OGuidResult::kMade;
 }

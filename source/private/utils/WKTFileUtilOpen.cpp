@@ -7,6 +7,7 @@
 #include "WKTRedirection.h"
 #include "WOCom.h"
 #include "WOLongPath.h"
+#include "WORegistry.h"
 
 #include <windows.h>
 
@@ -23,32 +24,14 @@ constexpr wchar_t kUserClasses[] = L"Software\\Classes\\";
 
 std::wstring WideOf(KTString const &text) { return text.GetWstring(); }
 
-std::wstring Expanded(std::wstring const &text) {
-    std::wstring expanded(ExpandEnvironmentStringsW(text.c_str(), nullptr, 0), L'\0');
-    DWORD const size = static_cast<DWORD>(expanded.size());
-    DWORD const length = ExpandEnvironmentStringsW(text.c_str(), expanded.data(), size);
-    if (length == 0 || length > size) {
-        return text;
-    }
-    expanded.resize(length - 1); // the zero at its end
-    return expanded;
-}
-
 // The unnamed value of a key; empty if there is none.
-std::wstring UnnamedValue(HKEY root, std::wstring const &key) {
-    DWORD size = 0;
-    constexpr DWORD kTexts = RRF_RT_REG_SZ | RRF_RT_REG_EXPAND_SZ | RRF_NOEXPAND;
-    if (RegGetValueW(root, key.c_str(), nullptr, kTexts, nullptr, nullptr, &size) != ERROR_SUCCESS) {
+std::wstring UnnamedValue(HKEY root, std::wstring const &name) {
+    WORegistryKey const key(root, name.c_str(), KEY_QUERY_VALUE);
+    KTUnits value;
+    if (!key.IsOpen() || !WOReadText(key.Get(), nullptr, value)) {
         return {};
     }
-    std::wstring value(size / sizeof(wchar_t) + 1, L'\0');
-    size = static_cast<DWORD>(value.size() * sizeof(wchar_t));
-    DWORD type = 0;
-    if (RegGetValueW(root, key.c_str(), nullptr, kTexts, &type, value.data(), &size) != ERROR_SUCCESS) {
-        return {}; // changed meanwhile
-    }
-    value.resize(std::wcslen(value.c_str()));
-    return type == REG_EXPAND_SZ ? Expanded(value) : value;
+    return {value.begin(), value.end()};
 }
 
 // The same among the registered classes. The user's own come first; Windows shows both as one, Wine does not.
@@ -107,28 +90,6 @@ KTFileUtil::ErrorCodeEnum ErrorOfShell(INT_PTR result) {
     }
 }
 
-// A key of the registry.
-class RegistryKey {
-  public:
-    RegistryKey(HKEY root, std::wstring const &name) {
-        if (RegOpenKeyExW(root, name.c_str(), 0, KEY_READ, &m_Key) != ERROR_SUCCESS) {
-            m_Key = nullptr;
-        }
-    }
-    RegistryKey(RegistryKey const &) = delete;
-    RegistryKey &operator=(RegistryKey const &) = delete;
-    ~RegistryKey() {
-        if (m_Key != nullptr) {
-            RegCloseKey(m_Key);
-        }
-    }
-
-    HKEY Get() const { return m_Key; }
-
-  private:
-    HKEY m_Key = nullptr;
-};
-
 // The class that the user registered for the extension, as far as it has the verb.
 std::wstring UserClassWithVerb(KTString const &extension, std::wstring const &verb) {
     std::wstring const key = WideOf(extension);
@@ -173,7 +134,7 @@ KTFileUtil::ErrorCodeEnum Open(KTFile const &file, wchar_t const *verb) {
                                  ? UserClassWithVerb(KTFileUtil::GetExtension(file), verb)
                                  : std::wstring();
     if (!own.empty()) { // see ClassValue: not every shell finds it
-        RegistryKey const key(HKEY_CURRENT_USER, kUserClasses + own);
+        WORegistryKey const key(HKEY_CURRENT_USER, (kUserClasses + own).c_str(), KEY_READ);
         request.fMask |= SEE_MASK_CLASSKEY;
         request.hkeyClass = key.Get();
         result = Execute(request);
