@@ -76,5 +76,6 @@ void AddStreamBenchmarks();
 void AddExceptionBenchmarks();
 void AddDictionaryBenchmarks();
 void AddThreadBenchmarks();
+void AddServiceBenchmarks();
 
 } // namespace bench

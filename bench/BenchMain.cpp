@@ -57,6 +57,7 @@ int main(int argc, char **argv) {
     bench::AddExceptionBenchmarks();
     bench::AddDictionaryBenchmarks();
     bench::AddThreadBenchmarks();
+    bench::AddServiceBenchmarks();
 
     bench::Report report;
     if (benchmark::RunSpecifiedBenchmarks(&report) == 0) {
