@@ -12,6 +12,7 @@
 #include <filesystem>
 #include <fstream>
 #include <memory>
+#include <regex>
 #include <stdexcept>
 #include <string>
 #include <vector>
@@ -154,6 +155,7 @@ TEST_F(Demo, CourseTextsAreCountedExactly) {
     EXPECT_EQ(outcome.status, 0U);
     EXPECT_EQ(outcome.Row("File"), "File Encoding Bytes Units Lines Words Non-ASCII U+FFFD Notes");
     EXPECT_EQ(outcome.Row("settings.ini"), "settings.ini UTF-8 1027 1026 42 124 1 0");
+    EXPECT_EQ(outcome.Row("settings.ini"), "settings.ini UTF-8 812 811 33 94 1 0");
     EXPECT_EQ(outcome.Row("captions/intro.bytes.txt"), "captions/intro.bytes.txt bytes 523 523 8 86 6 0");
     EXPECT_EQ(outcome.Row("captions/intro.utf16.txt"), "captions/intro.utf16.txt UTF-16 LE 1048 523 8 102 7 0");
     EXPECT_EQ(outcome.Row("strings/en_US.txt"), "strings/en_US.txt UTF-16 LE 1772 885 19 89 34 0");
@@ -292,6 +294,37 @@ TEST_F(Demo, MailProgramIsNamedAndNotUsed) {
     RegSetValueW(HKEY_LOCAL_MACHINE, kClients, REG_SZ, name, 0);
     EXPECT_TRUE(with.Has("\nMail\n  the course would be sent by: " + fs::path(name).string() + "\n\n")) << with.out;
     EXPECT_TRUE(without.Has("\nMail\n  not sent: No mail program is set up on this machine.\n\n")) << without.out;
+TEST_F(Demo, CourseSharesAreTakenApart) {
+    Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
+    EXPECT_EQ(outcome.Row("Server"), "Server Share Path Named in");
+    EXPECT_EQ(outcome.Row("harbour-server"), "harbour-server courses harbour-safety/1.4.2/ settings.ini");
+}
+
+TEST_F(Demo, SharesAreFoundAnywhereInALine) {
+    Write("a.txt", "see \"file://///one/public/x/y\" or <smb://two/share/>, not smb://three nor SMB://four/share/\n"
+                   "http://five/share/ smb://\xE6\xB8\xAF/caf\xC3\xA9/\n");
+    Write("b.txt", "nothing here: smb:// \n");
+    Outcome const outcome = CheckEmptyError(RunOnFolder());
+    EXPECT_EQ(outcome.Row("one"), "one public x/y a.txt");
+    EXPECT_EQ(outcome.Row("two"), "two share a.txt");
+    EXPECT_EQ(outcome.Row("\xE6\xB8\xAF"), "\xE6\xB8\xAF caf\xC3\xA9 a.txt");
+    for (char const *const name : {"three", "four", "five"}) {
+        EXPECT_EQ(outcome.Row(name), "");
+    }
+}
+
+TEST_F(Demo, TheSystemIsDescribed) {
+    Write("a.txt", "one\n");
+    Outcome const outcome = CheckEmptyError(RunOnFolder());
+    EXPECT_FALSE(outcome.Has("Shares named in the texts\n"));
+    EXPECT_TRUE(outcome.Has("\nSystem\n"));
+    EXPECT_TRUE(std::regex_match(outcome.Row("Windows version"),
+                                 std::regex("Windows version [0-9]+\\.[0-9]+\\.[0-9]+( \\(server\\))?")))
+        << outcome.out;
+    EXPECT_TRUE(std::regex_match(outcome.Row("process"), std::regex("process [0-9]+, [0-9]+ MiB in use")));
+    EXPECT_TRUE(std::regex_match(outcome.Row("new identifier"),
+                                 std::regex("new identifier [0-9a-f]{8}(-[0-9a-f]{4}){3}-[0-9a-f]{12}")));
+    EXPECT_EQ(outcome.Row("the folder"), "the folder is on this machine");
 }
 
 TEST_F(Demo, CourseChecksAllHold) {
@@ -365,6 +398,7 @@ TEST_F(Demo, LogIsWhereItSaysAndHasAsManyLines) {
     EXPECT_TRUE(outcome.Has("\n  " + count + " lines written, " + count + " in the file\n")) << outcome.out;
     EXPECT_TRUE(outcome.Has("\\temp\\ktap_log.txt\n")) << outcome.out;
     EXPECT_NE(log.find(": settings.ini: lines: 42, words: 124\n"), std::string::npos);
+    EXPECT_NE(log.find(": settings.ini: lines: 33, words: 94\n"), std::string::npos);
     // Each line is whole, and every thread has written.
     EXPECT_NE(log.find("worker 1: started\n"), std::string::npos);
     EXPECT_NE(log.find("worker 2: started\n"), std::string::npos);

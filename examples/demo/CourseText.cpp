@@ -1,6 +1,10 @@
-// CourseText.cpp: dictionary entries and caption lines.
+// CourseText.cpp: dictionary entries, caption lines and share URLs.
 
 #include "CourseText.h"
+
+#include "KTSMBUtils.h"
+
+#include <algorithm>
 
 namespace {
 
@@ -13,7 +17,11 @@ bool StartsWithDigit(KTString const &text) { return !text.empty() && text[0] >= 
 } // namespace
 
 void CourseTextCollector::AddLine(KTString const &line) {
-    if (line.size() <= kLongestLine && !AddEntry(line)) {
+    if (line.size() > kLongestLine) {
+        return;
+    }
+    AddShares(line);
+    if (!AddEntry(line)) {
         AddCue(line);
     }
 }
@@ -45,5 +53,20 @@ void CourseTextCollector::AddCue(KTString const &line) {
             line.substr(pieces[0].size() + pieces[1].size() + 2)};
     if (cue.start <= cue.end && cue.end <= kLongestCourse) {
         m_Cues.push_back(std::move(cue));
+    }
+}
+
+void CourseTextCollector::AddShares(KTString const &line) {
+    if (!line.Contains(KTString("://"))) {
+        return;
+    }
+    KTString::size_type start = 0;
+    while (start < line.size() && m_Shares.size() < kMost) {
+        KTString::size_type const end = std::min(line.find_first_of(KTString(" \t\"'<>=;,"), start), line.size());
+        KTString const word = line.substr(start, end - start);
+        if (!KTSmbUrl(word).getScheme().empty()) {
+            m_Shares.push_back(word);
+        }
+        start = end + 1;
     }
 }

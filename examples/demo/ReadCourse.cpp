@@ -42,6 +42,7 @@ void ReadText(TextResult &result, int worker, RunLog &log) {
     result.facts = ExamineText(decoded.text, [&](KTString const &line) { collector.AddLine(line); });
     result.entries = collector.TakeEntries();
     result.cues = collector.TakeCues();
+    result.shares = collector.TakeShares();
     if (result.facts.losslessPieces != result.facts.pieces) {
         result.notes.emplace_back("unpaired surrogates");
     }

@@ -21,6 +21,7 @@ struct TextResult {
     bool numbersSurvive = false; ///< see NumbersSurvive
     std::vector<DictionaryEntry> entries;
     std::vector<Cue> cues;
+    std::vector<KTString> shares; ///< URLs that name a share's server at least
 };
 
 /// Reads up to this much of each file; more is not text that an author wrote.

@@ -14,6 +14,7 @@
 #include "Report.h"
 #include "RunGuard.h"
 #include "RunLog.h"
+#include "Services.h"
 #include "Table.h"
 #include "WConsole.h"
 #include "WCrash.h"
@@ -76,6 +77,7 @@ int Run(Console const &console, Options const &options) {
     console.Print(ReportCaptions(results));
     console.Print(ReportDictionaries(results, limits));
     console.Print(ReportProperties(folder, limits));
+    console.Print(ReportShares(results, limits));
     console.Print(ReportOtherFiles(folder, limits));
     console.Print(ReportAnimation(folder));
     console.Print(ReportDigests(folder, limits));
@@ -89,6 +91,7 @@ int Run(Console const &console, Options const &options) {
         console.Print(ReportBinaryDictionary(languages));
     }
     console.Print(ReportMail());
+    console.Print(ReportSystem(path));
     console.Print(ReportChecks(results));
 
     bool const anyRead = std::any_of(results.begin(), results.end(), [](auto const &result) { return result.isRead; });
