@@ -234,6 +234,8 @@ TEST(AbiLayoutTest, GeometryIsPlainNumbersInOrder) {
     EXPECT_EQ(84U, sizeof(KTKeyframe));
     EXPECT_EQ(0x01020304, ValueAt<int>(&keyframe, 80));
     EXPECT_TRUE(std::is_trivially_copyable_v<KTKeyframe>);
+}
+
 TEST(AbiLayoutTest, ExceptionsHaveTheirFieldsInOrder) {
     EXPECT_EQ(48U, sizeof(KTException));
     EXPECT_EQ(48U, sizeof(KTFatalException));

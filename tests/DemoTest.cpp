@@ -280,6 +280,8 @@ TEST_F(Demo, EveryFileHasItsDigest) {
     EXPECT_EQ(outcome.Row("sub/abc.txt"),
               "sub/abc.txt ba7816bf8f01cfea414140de5dae2223b00361a396177a9cb410ff61f20015ad");
     EXPECT_EQ(outcome.Row("used.txt"), "used.txt in use");
+}
+
 TEST_F(Demo, MailProgramIsNamedAndNotUsed) {
     constexpr wchar_t kClients[] = L"Software\\Clients\\Mail";
     wchar_t name[256] = {};
@@ -294,6 +296,8 @@ TEST_F(Demo, MailProgramIsNamedAndNotUsed) {
     RegSetValueW(HKEY_LOCAL_MACHINE, kClients, REG_SZ, name, 0);
     EXPECT_TRUE(with.Has("\nMail\n  the course would be sent by: " + fs::path(name).string() + "\n\n")) << with.out;
     EXPECT_TRUE(without.Has("\nMail\n  not sent: No mail program is set up on this machine.\n\n")) << without.out;
+}
+
 TEST_F(Demo, CourseSharesAreTakenApart) {
     Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
     EXPECT_EQ(outcome.Row("Server"), "Server Share Path Named in");

@@ -62,7 +62,6 @@ int Run(Console const &console, Options const &options) {
         CrashWhileSaving(console, folder);
         return Fail(console, log, "did not crash");
     }
-    std::vector<TextResult> const results = ReadCourse(folder.files, log);
     std::vector<TextResult> results = ReadCourse(folder.files, log);
     std::vector<TextResult *> const languages = ChooseLanguages(results);
     LookTextsUp(languages);
