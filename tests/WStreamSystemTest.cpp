@@ -512,6 +512,31 @@ TEST_F(WStreamSystemTest, TextThatNeedsMemoryIsReportedNotThrown) {
                                                     "source/private/streams/CKTStreamWrite:84"}));
 }
 
+int buffers = 0;
+void *CountingNew(std::size_t size, std::nothrow_t const &) {
+    buffers += size == kBuffer ? 1 : 1000;
+    return ::operator new[](size, std::nothrow);
+}
+
+// One buffer for writing and one for reading ahead, however much goes through them.
+TEST_F(WStreamSystemTest, MemoryDoesNotGrowWithTheFile) {
+    WImportHook const counting(kLibrary, "_ZnayRKSt9nothrow_t", &CountingNew);
+    ASSERT_TRUE(counting.IsActive());
+    buffers = 0;
+    Open(File("file", ""), 3);
+    for (int i = 0; i < 1000000; ++i) {
+        unsigned char bytes[8] = {};
+        transport.Write(bytes, sizeof bytes);
+    }
+    EXPECT_EQ(buffers, 1);
+    transport.Seek(0, kKTSeekFromBeginning);
+    for (int i = 0; i < 1000000; ++i) {
+        unsigned char bytes[8] = {};
+        ASSERT_EQ(transport.Read(bytes, sizeof bytes), sizeof bytes);
+    }
+    EXPECT_EQ(buffers, 2);
+}
+
 // ---- without end ----
 
 // Its size is there, its bytes are not.

@@ -45,7 +45,7 @@ void CKTStreamReadWrite::Destroy() {
     m_Reader = nullptr;
     delete m_Writer;
     m_Writer = nullptr;
-    Close();
+    Close(); // NOLINT(clang-analyzer-optin.cplusplus.VirtualCall): that of the class whose destructor runs
     delete m_Transport;
     m_Transport = nullptr;
 }

@@ -5,16 +5,16 @@
 #include "IKTXferBytes.h"
 
 IKTXferBytes::IKTXferBytes() = default;
-IKTXferBytes::IKTXferBytes(IKTXferBytes const &other) = default;
-IKTXferBytes &IKTXferBytes::operator=(IKTXferBytes const &other) = default;
+IKTXferBytes::IKTXferBytes(IKTXferBytes const &) = default;
+IKTXferBytes &IKTXferBytes::operator=(IKTXferBytes const &) = default;
 IKTXferBytes::~IKTXferBytes() = default;
 
 IKTStream::IKTStream() = default;
-IKTStream::IKTStream(IKTStream const &other) = default;
-IKTStream &IKTStream::operator=(IKTStream const &other) = default;
+IKTStream::IKTStream(IKTStream const &) = default;
+IKTStream &IKTStream::operator=(IKTStream const &) = default;
 IKTStream::~IKTStream() = default;
 
 IKTReadWriteStream::IKTReadWriteStream() = default;
-IKTReadWriteStream::IKTReadWriteStream(IKTReadWriteStream const &other) = default;
-IKTReadWriteStream &IKTReadWriteStream::operator=(IKTReadWriteStream const &other) = default;
+IKTReadWriteStream::IKTReadWriteStream(IKTReadWriteStream const &) = default;
+IKTReadWriteStream &IKTReadWriteStream::operator=(IKTReadWriteStream const &) = default;
 IKTReadWriteStream::~IKTReadWriteStream() = default;

@@ -38,6 +38,7 @@ void OReportNoMemory(char const *message, char const *path, int line) noexcept {
     }
 }
 
+// NOLINTNEXTLINE(cppcoreguidelines-pro-type-member-init): the array is written as far as it is used
 OStreamTextWriter::OStreamTextWriter(KTString const &text, bool utf8) {
     std::size_t count = text.size();
     if (!utf8) {

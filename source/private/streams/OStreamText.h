@@ -41,7 +41,8 @@ class OStreamTextWriter {
 /// as the bytes before them have come.
 class OStreamTextReader {
   public:
-    OStreamTextReader() = default;
+    // NOLINTNEXTLINE(cppcoreguidelines-pro-type-member-init,modernize-use-equals-default): clears no array
+    OStreamTextReader() {}
     OStreamTextReader(OStreamTextReader const &) = delete;
     OStreamTextReader &operator=(OStreamTextReader const &) = delete;
     ~OStreamTextReader() = default;

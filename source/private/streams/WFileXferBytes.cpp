@@ -127,7 +127,9 @@ KTBool16 FileXferBytes::Open(KTFile const &file, unsigned int mode, unsigned int
 }
 
 void FileXferBytes::Close() {
-    Flush();
+    if (m_WriteFill != 0) {
+        WriteOutBuffer();
+    }
     delete[] m_WriteBuffer;
     m_WriteBuffer = nullptr;
     delete[] m_ReadAheadBuffer;

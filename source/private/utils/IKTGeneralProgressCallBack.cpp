@@ -3,6 +3,6 @@
 #include "IKTGeneralProgressCallBack.h"
 
 IKTGeneralProgressCallBack::IKTGeneralProgressCallBack() = default;
-IKTGeneralProgressCallBack::IKTGeneralProgressCallBack(IKTGeneralProgressCallBack const &other) = default;
-IKTGeneralProgressCallBack &IKTGeneralProgressCallBack::operator=(IKTGeneralProgressCallBack const &other) = default;
+IKTGeneralProgressCallBack::IKTGeneralProgressCallBack(IKTGeneralProgressCallBack const &) = default;
+IKTGeneralProgressCallBack &IKTGeneralProgressCallBack::operator=(IKTGeneralProgressCallBack const &) = default;
 IKTGeneralProgressCallBack::~IKTGeneralProgressCallBack() = default;

@@ -15,8 +15,8 @@ constexpr int kNoPlaceLine = 57;
 } // namespace
 
 IKTDataProvider::IKTDataProvider() = default;
-IKTDataProvider::IKTDataProvider(IKTDataProvider const &other) = default;
-IKTDataProvider &IKTDataProvider::operator=(IKTDataProvider const &other) = default;
+IKTDataProvider::IKTDataProvider(IKTDataProvider const &) = default;
+IKTDataProvider &IKTDataProvider::operator=(IKTDataProvider const &) = default;
 IKTDataProvider::~IKTDataProvider() = default;
 
 KTMemoryDataProvider::KTMemoryDataProvider(void *data, unsigned long long size) : m_Data(data), m_Size(size) {
