@@ -306,7 +306,7 @@ class FileXferModelTest : public StreamFixture {
 TEST_F(FileXferModelTest, DoesWhatThePlainModelDoesInAMillionOperations) {
     char const *const given = std::getenv("KT_STREAM_SEED");
     unsigned int const seed = given == nullptr ? std::random_device{}() : static_cast<unsigned int>(std::atoll(given));
-    std::cout << "seed " << seed << std::endl;
+    std::cout << "seed " << seed << '\n';
     m_Random.seed(seed);
     Model model;
     File("model", "");

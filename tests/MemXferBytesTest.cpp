@@ -176,7 +176,8 @@ TEST(MemXferBytesTest, WouldForwardToABackingStore) {
         MemXferBytes transport;
         FileXferBytes *const store = new BackingStore(calls);
         auto *const bytes = reinterpret_cast<unsigned char *>(&transport);
-        std::memcpy(bytes + sizeof transport - sizeof store, &store, sizeof store);
+        auto const address = reinterpret_cast<std::uintptr_t>(store);
+        std::memcpy(bytes + sizeof transport - sizeof address, &address, sizeof address);
         KTBool16 const active = 1;
         std::memcpy(bytes + 34, &active, sizeof active);
         EXPECT_EQ(transport.Read(nullptr, 300000), 300000U);
