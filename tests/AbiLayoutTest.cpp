@@ -39,7 +39,7 @@
 //         32  KTString  path           32  bool      the connection failed
 //         64  KTString  authority
 //         96  KTString  scheme
-
+//
 //     KTException, KTFatalException, KTNonFatalException, 48 bytes      KTLCException, 80 bytes
 //          0  virtual table                                                  0  virtual table
 //          8  char const *  the key's characters                             8  KTString  reason

@@ -544,7 +544,7 @@ TEST_F(Demo, HugeFileIsCutBetweenCharacters) {
 TEST_F(Demo, HelpAndWrongUsage) {
     Outcome const help = CheckEmptyError(Run(L"--help"));
     EXPECT_EQ(help.status, 0U);
-    EXPECT_TRUE(help.out.starts_with("usage: ktdemo [--all] [FOLDER]\n"));
+    EXPECT_TRUE(help.out.starts_with("usage: ktdemo [--all | --crash] [FOLDER]\n"));
     for (wchar_t const *arguments : {L"--bogus", L"one two"}) {
         Outcome const outcome = Run(arguments);
         EXPECT_EQ(outcome.status, 2U);

@@ -81,6 +81,21 @@ TEST(ExceptionMsgTest, DISABLED_WithoutCallBacks) {
     EXPECT_TRUE(KTExceptionMsgManager::GetDataBackUpFailedMsg().empty());
 }
 
+// As hosts do it: both callbacks on the process-wide dictionary.
+KTErrorCodeEnum AddToDictionary(KTString const &key, KTString const &text) {
+    return KTPublicUtils::GetStringDictionary().AddString(key, text);
+}
+
+KTString FindInDictionary(KTString const &key) { return KTPublicUtils::GetStringDictionary().GetKeyValue(key); }
+
+TEST(ExceptionMsgTest, DISABLED_ThroughTheDictionary) {
+    RegisterMsgRegistrarCallBack(&AddToDictionary);
+    RegisterMsgStrGetterCallBack(&FindInDictionary);
+    KTExceptionMsgManager::RegisterBaseExceptionMsgs(true);
+    EXPECT_EQ(kAll[0].second, KTFatalException(kKTExceptionMsgStr).What().GetUTF8String());
+    EXPECT_EQ(kAll[1].second, KTExceptionMsgManager::GetDataBackUpFailedMsg().GetUTF8String());
+}
+
 class ExceptionMsgChildTest : public testing::TestWithParam<char const *> {};
 
 TEST_P(ExceptionMsgChildTest, InAProcessOfItsOwn) {
@@ -90,6 +105,7 @@ TEST_P(ExceptionMsgChildTest, InAProcessOfItsOwn) {
 }
 
 INSTANTIATE_TEST_SUITE_P(Each, ExceptionMsgChildTest,
-                         testing::Values("RegisteredAndCached", "CachedOnly", "WithoutCallBacks"));
+                         testing::Values("RegisteredAndCached", "CachedOnly", "WithoutCallBacks",
+                                         "ThroughTheDictionary"));
 
 } // namespace
