@@ -11,7 +11,10 @@ if(MINGW)
     if(NOT IS_ABSOLUTE "${path}")
       message(FATAL_ERROR "The compiler does not say where ${name} is")
     endif()
-    file(COPY ${path} DESTINATION ${CMAKE_BINARY_DIR}/bin)
+    # Without their debug information, which is ten times as large as they are, and which every crash dump would read.
+    file(MAKE_DIRECTORY ${CMAKE_BINARY_DIR}/bin)
+    execute_process(COMMAND ${CMAKE_STRIP} --strip-unneeded -o ${CMAKE_BINARY_DIR}/bin/${name} ${path}
+                    COMMAND_ERROR_IS_FATAL ANY)
     list(APPEND KT_RUNTIME_DLLS ${CMAKE_BINARY_DIR}/bin/${name})
   endforeach()
 endif()
