@@ -288,6 +288,23 @@ command_soak() {
     "$root/cmake/wine-run" --temp "$temp" "$root/build/windows/bin/ktsoak.exe" "$seconds"
 }
 
+# fuzz_target PROGRAM SECONDS: on the committed seeds and what earlier runs found.
+fuzz_target() {
+    local name=${1##*/fuzz_} corpus log
+    corpus=$root/build/fuzz/$name
+    log=$root/build/fuzz/$name.log
+    mkdir -p "$corpus"
+    (cd "$root/build/fuzz" && "$1" -max_total_time="$2" -timeout=10 -rss_limit_mb=2048 -print_final_stats=1 \
+        -artifact_prefix="$name-" "$corpus" "$root/fuzz/corpus/$name") >"$log" 2>&1 || {
+        tail -n 40 "$log" >&2
+        echo "kt: fuzz target $name failed; the input is in build/fuzz/ (build/fuzz/$name.log)" >&2
+        : >"$root/build/fuzz/failed"
+        return
+    }
+    echo "kt: $name: $(sed -n 's/^stat::number_of_executed_units: *//p' "$log") inputs in $2 s"
+}
+
+# As many targets at a time as there are processors.
 command_fuzz() {
     local seconds=${1:-} target
     [[ $seconds =~ ^[0-9]+$ ]] || fail "usage: ./kt fuzz SECONDS"
@@ -295,18 +312,15 @@ command_fuzz() {
     need_packages cmake ninja-build "${native_packages[@]}"
     configure native-fuzz
     compile native-fuzz
+    rm -f "$root/build/fuzz/failed"
     for target in "$root"/build/native-fuzz/bin/fuzz_*; do
-        local name=${target##*/fuzz_}
-        local corpus=$root/build/fuzz/$name
-        mkdir -p "$corpus"
-        echo "kt: fuzzing $name for $seconds s"
-        (cd "$root/build/fuzz" && "$target" -max_total_time="$seconds" -timeout=10 -rss_limit_mb=2048 \
-            -print_final_stats=1 "$corpus" "$root/fuzz/corpus/$name") >"$root/build/fuzz/$name.log" 2>&1 || {
-            tail -n 40 "$root/build/fuzz/$name.log" >&2
-            fail "fuzz target $name failed; the input is in build/fuzz/ (build/fuzz/$name.log)"
-        }
-        grep -h 'number_of_executed_units' "$root/build/fuzz/$name.log"
+        if [ "$(jobs -rp | wc -l)" -ge "$jobs" ]; then
+            wait -n
+        fi
+        fuzz_target "$target" "$seconds" &
     done
+    wait
+    [ ! -e "$root/build/fuzz/failed" ] || exit 1
 }
 
 command_lint() {
