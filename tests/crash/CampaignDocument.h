@@ -24,12 +24,13 @@ class CampaignDocument {
         return stream->GetStreamState() == kKTStreamStateGood;
     }
 
-    /// Whether the file holds this document, whole.
+    /// Whether the file holds this document, whole. Its values tell, not the stream's state: a read that takes a file's
+    /// last bytes out of a fresh read-ahead buffer has reached the end of the stream, though nothing is missing.
     bool IsIn(KTFile const &file) const {
         std::unique_ptr<IKTStream> const stream(
             KTStreamUtil::CreateFileStreamRead(file, FileXferBytes::kOpenRead, 0, 0));
         unsigned char more = 0;
-        return stream != nullptr && Transfer(*stream, [] {}) && stream->GetStreamState() == kKTStreamStateGood &&
+        return stream != nullptr && Transfer(*stream, [] {}) && stream->GetStreamState() != kKTStreamStateError &&
                stream->XferByte(&more, 1) == 0;
     }
 
