@@ -66,6 +66,9 @@ std::string ReportDocument(CourseDocument &document) {
         return clone != nullptr;
     });
     bool const isCloneSame = AreEqual(stream, clone);
+    DigestCheck const digests = readBack.CheckDigests();
     return "Document\n" + steps.Print() + "  read back and saved again, the document is the same: " + YesOrNo(isSame) +
-           "\n  the clone is the same: " + YesOrNo(isCloneSame) + "\n\n";
+           "\n  the clone is the same: " + YesOrNo(isCloneSame) +
+           "\n  files whose SHA-256 is the stored one: " + std::to_string(digests.right) + " of " +
+           std::to_string(digests.checked) + "\n\n";
 }
