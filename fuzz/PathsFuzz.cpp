@@ -39,7 +39,7 @@ void CheckFullPath(OUnitsView text) {
         return;
     }
     Check(!path->empty() && path->size() <= kOLongestPath);
-    Check(path->find('/') == KTUnits::npos && path->find(0) == KTUnits::npos);
+    Check(path->find('/') == KTUnits::npos && path->find(static_cast<unsigned short>(0)) == KTUnits::npos);
     Check(path->back() != '\\' || path->size() <= 3 || path->substr(0, 4) == UnitsFrom("\\\\?\\"));
     Check(OMakeFullPath(*path, home) == path);
 }
@@ -74,7 +74,7 @@ void CheckParts(KTString const &text) {
     OPath const path(text.GetOString());
     Check(KTString(path.GetBaseName()) + KTString(path.GetExtension()) == KTString(path.GetFileName()));
     OPath const parent = path.GetParent();
-    Check(parent.GetString().size() <= path.GetString().size());
+    Check(parent.GetString().GetUnits().size() <= path.GetString().GetUnits().size());
     Check(parent.IsEmpty() || parent.GetString() != path.GetString());
     std::vector<OString> const parts = path.GetComponents();
     for (OString const &part : parts) {
@@ -82,7 +82,8 @@ void CheckParts(KTString const &text) {
     }
     KTPath changed(text);
     changed.Append("name.txt");
-    Check(KTString(changed.GetOPath().GetFileName()) == "name.txt");
+    bool const isJoined = text.empty() || text[text.size() - 1] == '\\' || text[text.size() - 1] == '/';
+    Check(changed.GetPathAsKTString() == text + (isJoined ? "name.txt" : "\\name.txt"));
     KTPath slashed(text);
     slashed.ReplaceAllBackSlashWithFrontSlash();
     Check(slashed.GetPathAsKTString().find(static_cast<unsigned short>('\\')) == KTString::npos);

@@ -277,7 +277,7 @@ TEST(AbiLayoutTest, ExceptionUtilsHaveTheirFieldsInOrder) {
 }
 
 // The dictionary behind the text, then whether the document is finished.
-TEST(AbiLayout, TheResourceDocumentIsAStringAndTwoFields) {
+TEST(AbiLayoutTest, TheResourceDocumentIsAStringAndTwoFields) {
     EXPECT_EQ(sizeof(KTString) + 16, sizeof(KTStringResourceXML));
     IKTStringDictionary &dictionary = *KTStringDictionary::GetStringDictionary();
     KTStringResourceXML const document(dictionary);
