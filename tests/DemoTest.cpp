@@ -387,7 +387,7 @@ TEST_F(Demo, CourseIsSavedAsOneDocumentReadBackComparedAndCloned) {
     }
     EXPECT_TRUE(section.Has("\n  read back and saved again, the document is the same: yes\n")) << outcome.out;
     EXPECT_TRUE(section.Has("\n  the clone is the same: yes\n")) << outcome.out;
-    EXPECT_TRUE(section.Has("\n  files whose SHA-256 is the stored one: 1 of 1\n")) << outcome.out;
+    EXPECT_TRUE(section.Has("\n  digests that are the stored ones: 1 of 1\n")) << outcome.out;
     EXPECT_TRUE(section.Has("\n  one changed bit is found: yes\n")) << outcome.out;
 }
 
@@ -395,7 +395,7 @@ TEST_F(Demo, CourseDocumentHoldsTheExampleCourse) {
     Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
     EXPECT_TRUE(outcome.Has("\n  read back and saved again, the document is the same: yes\n")) << outcome.out;
     EXPECT_TRUE(outcome.Has("\n  the clone is the same: yes\n")) << outcome.out;
-    EXPECT_TRUE(outcome.Has("\n  files whose SHA-256 is the stored one: 11 of 11\n")) << outcome.out;
+    EXPECT_TRUE(outcome.Has("\n  digests that are the stored ones: 11 of 11\n")) << outcome.out;
 }
 
 TEST_F(Demo, ACourseThatCannotBeCopiedIsStillShown) {

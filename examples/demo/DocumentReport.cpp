@@ -52,7 +52,7 @@ class Steps {
 // Checks the files against their digests; then again with one bit changed, which must show.
 std::string ReportDigestCheck(CourseDocument &document) {
     DigestCheck const digests = document.CheckDigests();
-    std::string text = "  files whose SHA-256 is the stored one: " + std::to_string(digests.right) + " of " +
+    std::string text = "  digests that are the stored ones: " + std::to_string(digests.right) + " of " +
                        std::to_string(digests.checked) + "\n";
     auto const file = std::find_if(document.files.begin(), document.files.end(),
                                    [](DocumentFile const &one) { return !one.bytes.empty(); });
