@@ -40,6 +40,9 @@ std::string ktabi::KT_HOST_FUNCTION() {
     KTVariant variant;
     variant.SetObject({{KTString("key"), KTVariant(3)}});
     bool const found = variant.GetObject().at("key").GetInt() == 3 && GetObject(nullptr, 0, nullptr) == 0;
+    int width = 0;
+    bool const set = KTSimpleIniFileReader(KTString("missing.ini")).GetIntValForVariable("Player", "Width", width);
+    bool const captioned = !KTClosedCaptionFileReader().GetLinesFromFile(KTString("missing.txt"), 4U).empty();
     Deallocate(Allocate(10));
     gKTLogger->Log("host unit %d", 1);
     gKTLogger->Log(std::wstring(L"host unit"));
@@ -48,6 +51,7 @@ std::string ktabi::KT_HOST_FUNCTION() {
     // The system's own names still mean the system's functions.
     bool const running = GetModuleHandle(nullptr) != nullptr && GetTickCount64() != 0;
     return text.GetUTF8String() +
-           (woken || !running || !refused || !found || largest != KTString::npos ? " wrong" : " right") +
+           (woken || !running || !refused || !found || set || captioned || largest != KTString::npos ? " wrong"
+                                                                                                     : " right") +
            (temporary == KTFile() ? " nowhere" : "") + KTPublicUtils::ConstructLogStr(" v", 1.5F);
 }

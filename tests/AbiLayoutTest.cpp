@@ -276,6 +276,16 @@ TEST(AbiLayoutTest, ExceptionUtilsHaveTheirFieldsInOrder) {
     EXPECT_EQ(static_cast<void *>(&handler), PointerAt(&utils, 16));
 }
 
+// The dictionary behind the text, then whether the document is finished.
+TEST(AbiLayoutTest, TheResourceDocumentIsAStringAndTwoFields) {
+    EXPECT_EQ(sizeof(KTString) + 16, sizeof(KTStringResourceXML));
+    IKTStringDictionary &dictionary = *KTStringDictionary::GetStringDictionary();
+    KTStringResourceXML const document(dictionary);
+    EXPECT_EQ(static_cast<void const *>(&document), static_cast<KTString const *>(&document));
+    EXPECT_EQ(8U, sizeof(KTSimpleIniFileReader));
+    EXPECT_EQ(1U, sizeof(KTClosedCaptionFileReader));
+}
+
 TEST(AbiLayoutTest, ThreadsAndTheirMessagesHaveTheirFieldsInOrder) {
     EXPECT_EQ(16U, sizeof(KTThread));
     EXPECT_EQ(16U, sizeof(KTWorkerThread));

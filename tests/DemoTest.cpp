@@ -256,14 +256,25 @@ TEST_F(Demo, SettingsOfAnyKindAreTakenAsTheyAre) {
                      "[Shortcuts]\nnone=0\nodd=0x00010041\ntext=F1\n");
     Outcome const outcome = CheckEmptyError(RunOnFolder());
     EXPECT_EQ(outcome.status, 0U);
-    EXPECT_TRUE(outcome.Has("\n  S          a         string    0x\n")) << outcome.out;
-    EXPECT_TRUE(outcome.Has("\n  S          b         int       -1\n"));
-    EXPECT_TRUE(outcome.Has("\n  S          c         string    9999999999\n"));
-    EXPECT_TRUE(outcome.Has("\n  S          d         string    .\n"));
-    EXPECT_TRUE(outcome.Has("\n  S          e         string    #12345G\n"));
-    EXPECT_TRUE(outcome.Has("\n  S          f         double    0.50\n"));
+    EXPECT_TRUE(outcome.Has("\n  S]         a         string    0x\n")) << outcome.out;
+    EXPECT_TRUE(outcome.Has("\n  S]         b         int       -1\n"));
+    EXPECT_TRUE(outcome.Has("\n  S]         c         string    9999999999\n"));
+    EXPECT_TRUE(outcome.Has("\n  S]         d         string    .\n"));
+    EXPECT_TRUE(outcome.Has("\n  S]         e         string    #12345G\n"));
+    EXPECT_TRUE(outcome.Has("\n  S]         f         double    0.50\n"));
     EXPECT_EQ(outcome.Row("none"), "none 0 0");
     EXPECT_EQ(outcome.Row("odd"), "odd A 65 0");
+}
+
+TEST_F(Demo, SettingsAndCaptionsAreReadByTheReadersRules) {
+    Write("any.ini", "\xEF\xBB\xBF [S] \r\n\t a =1\n==c\n;d=4\n#e=\r5");
+    Write("caf.txt", "0.5\t2\tcaf\xE9\tau lait\n\t 2|3|one|two\n3\t4\t\n4\t\t5\n");
+    Outcome outcome = CheckEmptyError(RunOnFolder());
+    EXPECT_TRUE(outcome.Has("\n  S        a         int     1\n")) << outcome.out;
+    EXPECT_TRUE(outcome.Has("\n  S        =         string  c\n"));
+    EXPECT_TRUE(outcome.Has("\n  S        #e        int     5\n"));
+    outcome.out.erase(0, std::min(outcome.out.find("Captions\n"), outcome.out.size()));
+    EXPECT_TRUE(outcome.Row("caf.txt").starts_with("caf.txt 2 ")) << outcome.out;
 }
 
 TEST_F(Demo, EveryFileHasItsDigest) {
@@ -368,19 +379,23 @@ TEST_F(Demo, CourseIsSavedAsOneDocumentReadBackComparedAndCloned) {
     Outcome section;
     section.out = outcome.out.substr(start);
     EXPECT_EQ(section.Row("Step"), "Step Bytes ms Whole");
-    // Marks and version 12, title 4 + 6, lengths of the three lists 12; name 4 + 5, kind 4, size 8, bytes 4 + 4.
+    // Marks and version 12, title 4 + 6, lengths of the three lists 12; name 4 + 5, kind 4, size 8, digest 4 + 64,
+    // bytes 4 + 4.
     for (std::string const step : {"saved", "read back", "saved again", "compared", "cloned"}) {
-        EXPECT_TRUE(section.Row(step).starts_with(step + " 63 ")) << outcome.out;
+        EXPECT_TRUE(section.Row(step).starts_with(step + " 131 ")) << outcome.out;
         EXPECT_TRUE(section.Row(step).ends_with(" yes")) << outcome.out;
     }
     EXPECT_TRUE(section.Has("\n  read back and saved again, the document is the same: yes\n")) << outcome.out;
     EXPECT_TRUE(section.Has("\n  the clone is the same: yes\n")) << outcome.out;
+    EXPECT_TRUE(section.Has("\n  digests that are the stored ones: 1 of 1\n")) << outcome.out;
+    EXPECT_TRUE(section.Has("\n  one changed bit is found: yes\n")) << outcome.out;
 }
 
 TEST_F(Demo, CourseDocumentHoldsTheExampleCourse) {
     Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
     EXPECT_TRUE(outcome.Has("\n  read back and saved again, the document is the same: yes\n")) << outcome.out;
     EXPECT_TRUE(outcome.Has("\n  the clone is the same: yes\n")) << outcome.out;
+    EXPECT_TRUE(outcome.Has("\n  digests that are the stored ones: 11 of 11\n")) << outcome.out;
 }
 
 TEST_F(Demo, ACourseThatCannotBeCopiedIsStillShown) {

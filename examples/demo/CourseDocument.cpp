@@ -3,6 +3,7 @@
 #include "CourseDocument.h"
 
 #include "FileXferBytes.h"
+#include "KTPublicUtils.h"
 #include "KTStreamUtil.h"
 
 #include <algorithm>
@@ -14,15 +15,34 @@ constexpr KTUInt64 kMostKept = 8ULL << 20; // of one file
 constexpr KTUInt64 kMostKeptInAll = 64ULL << 20;
 constexpr int kPiece = 1 << 20;
 
-std::vector<unsigned char> ReadBytes(CourseFile const &file) {
-    std::unique_ptr<IKTStream> const stream(
-        KTStreamUtil::CreateFileStreamRead(KTFile(file.path), FileXferBytes::kOpenRead, 0, 0));
-    if (stream == nullptr) {
-        return {};
+constexpr KTUInt64 kMostDigested = 1ULL << 28; // of the files that are not kept
+
+using Stream = std::unique_ptr<IKTStream>;
+
+Stream Open(CourseFile const &file) {
+    return Stream(KTStreamUtil::CreateFileStreamRead(KTFile(file.path), FileXferBytes::kOpenRead, 0, 0));
+}
+
+KTString DigestOf(std::vector<unsigned char> const &bytes) {
+    static constexpr unsigned char kNothing = 0;
+    return KTPublicUtils::GenerateHash(bytes.empty() ? &kNothing : bytes.data(),
+                                       static_cast<unsigned int>(bytes.size()), kKTHashSHA256);
+}
+
+// The file's bytes and their digest; both empty if it cannot be read.
+void Keep(CourseFile const &file, DocumentFile &entry) {
+    Stream const stream = Open(file);
+    if (stream != nullptr) {
+        entry.bytes.resize(file.size);
+        int const count = stream->XferByte(entry.bytes.data(), static_cast<int>(file.size));
+        entry.bytes.resize(static_cast<std::size_t>(count));
+        entry.digest = DigestOf(entry.bytes);
     }
-    std::vector<unsigned char> bytes(file.size);
-    bytes.resize(static_cast<std::size_t>(stream->XferByte(bytes.data(), static_cast<int>(bytes.size()))));
-    return bytes;
+}
+
+KTString DigestOf(CourseFile const &file) {
+    Stream const stream = Open(file);
+    return stream == nullptr ? KTString() : KTPublicUtils::GenerateHash(stream.get(), kKTHashSHA256);
 }
 
 // Bytes behind their number. A number that is not true costs no more memory than one piece.
@@ -75,11 +95,15 @@ bool XferMark(IKTStream &stream, KTInt32 mark) {
 
 CourseDocument::CourseDocument(CourseFolder const &folder, std::vector<TextResult> const &texts) {
     KTUInt64 kept = 0;
+    KTUInt64 digested = 0;
     for (CourseFile const &file : folder.files) {
-        DocumentFile entry{file.name, static_cast<KTInt32>(file.kind), static_cast<KTInt64>(file.size), {}};
+        DocumentFile entry{file.name, static_cast<KTInt32>(file.kind), static_cast<KTInt64>(file.size), {}, {}};
         if (file.size <= kMostKept && kept + file.size <= kMostKeptInAll) {
-            entry.bytes = ReadBytes(file);
+            Keep(file, entry);
             kept += entry.bytes.size();
+        } else if (digested + file.size <= kMostDigested) {
+            entry.digest = DigestOf(file);
+            digested += file.size;
         }
         files.push_back(std::move(entry));
     }
@@ -98,6 +122,7 @@ bool CourseDocument::Xfer(IKTStream &stream) {
         stream.XferString(file.name, true, true);
         stream.XferInt32(file.kind);
         stream.XferInt64(file.size);
+        stream.XferString(file.digest, true, true);
         XferBytes(stream, file.bytes);
     });
     XferList(stream, entries, [&](DictionaryEntry &entry) {
@@ -125,4 +150,14 @@ bool CourseDocument::Save(KTFile const &file) {
 bool CourseDocument::Load(KTFile const &file) {
     std::unique_ptr<IKTStream> const stream(KTStreamUtil::CreateFileStreamRead(file, FileXferBytes::kOpenRead, 0, 0));
     return stream != nullptr && Xfer(*stream);
+}
+
+DigestCheck CourseDocument::CheckDigests() const {
+    DigestCheck check;
+    for (DocumentFile const &file : files) {
+        bool const isKept = !file.digest.empty() && static_cast<KTInt64>(file.bytes.size()) == file.size;
+        check.checked += isKept ? 1 : 0;
+        check.right += isKept && DigestOf(file.bytes) == file.digest ? 1 : 0;
+    }
+    return check;
 }

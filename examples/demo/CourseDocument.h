@@ -5,7 +5,8 @@
 //     i32      kDocumentMark
 //     i32      kDocumentVersion
 //     string   title
-//     i32      number of files; for each: string name, i32 kind, i64 size, i32 bytes kept, the bytes
+//     i32      number of files; for each: string name, i32 kind, i64 size, string SHA-256 digest,
+//                                  i32 bytes kept, the bytes
 //     i32      number of texts; for each: string key, string text
 //     i32      number of captions; for each: f64 start, f64 end, string text
 //     i32      kDocumentMark again, by which a document that was cut off is known
@@ -19,13 +20,20 @@
 #include <vector>
 
 constexpr KTInt32 kDocumentMark = 0x4B544344;
-constexpr KTInt32 kDocumentVersion = 1;
+constexpr KTInt32 kDocumentVersion = 2;
 
 struct DocumentFile {
     KTString name;
     KTInt32 kind = 0; ///< a FileKind
     KTInt64 size = 0;
+    KTString digest;                  ///< SHA-256 of the file in hexadecimal; empty if it could not be read
     std::vector<unsigned char> bytes; ///< all of them, or none of a file that is too large to keep
+};
+
+/// What the digests of a document showed.
+struct DigestCheck {
+    std::size_t checked = 0;
+    std::size_t right = 0;
 };
 
 class CourseDocument {
@@ -44,6 +52,9 @@ class CourseDocument {
 
     /// Reads the document from a file. False if it is missing, cut off, or no document.
     bool Load(KTFile const &file);
+
+    /// How many files have the digest that was stored with them. Only those are looked at whose bytes the document keeps.
+    DigestCheck CheckDigests() const;
 
     KTString title = "Course";
     std::vector<DocumentFile> files;

@@ -24,30 +24,41 @@ bool ConsistsOf(KTString const &text, char const *set) {
 
 bool IsHex(KTString const &text) { return ConsistsOf(text, "0123456789abcdefABCDEF"); }
 
-// "0x1A" and "26" as numbers of at most eight and nine digits, which any int holds.
-bool ReadInt(KTString const &text, int &value) {
-    bool const isHex = text.size() > 2 && text.substr(0, 2) == "0x";
-    KTString const digits = isHex ? text.substr(2) : text;
-    if (isHex ? !IsHex(digits) || digits.size() > 8 : !ConsistsOf(digits, "0123456789") || digits.size() > 9) {
-        return false;
+// A variable of the settings, and its text.
+struct Setting {
+    KTSimpleIniFileReader &settings;
+    KTString const &section;
+    KTString const &name;
+    KTString const &text;
+};
+
+// "26" and "0x1A" as numbers of at most nine and eight digits, which any int holds. The reader's numbers are decimal.
+bool ReadInt(Setting const &setting, int &value) {
+    KTString const &text = setting.text;
+    if (ConsistsOf(text, "0123456789") && text.size() <= 9) {
+        return setting.settings.GetIntValForVariable(setting.section, setting.name, value);
     }
-    value = static_cast<int>(digits.GetIntValue(isHex ? std::hex : std::dec));
-    return true;
+    bool const isHex = text.size() > 2 && text.size() <= 10 && text.substr(0, 2) == "0x" && IsHex(text.substr(2));
+    value = isHex ? static_cast<int>(text.substr(2).GetIntValue(std::hex)) : value;
+    return isHex;
 }
 
-KTVariant ValueOf(KTString const &text, bool isShortCut) {
+KTVariant ValueOf(Setting const &setting) {
+    KTString const &text = setting.text;
     int number = 0;
+    double real = 0;
     if (text.empty()) {
         return {};
     }
-    if (ReadInt(text, number)) {
-        return isShortCut ? KTVariant(KTShortCut(number)) : KTVariant(number);
+    if (ReadInt(setting, number)) {
+        return setting.section == kShortCutSection ? KTVariant(KTShortCut(number)) : KTVariant(number);
     }
     if (text.size() == 7 && text[0] == '#' && IsHex(text.substr(1))) {
         return {KTColor(0xFF000000 | text.substr(1).GetIntValue(std::hex))};
     }
-    if (ConsistsOf(text, "0123456789.") && std::count(text.begin(), text.end(), '.') == 1 && text.size() > 1) {
-        return {text.GetDoubleValue()};
+    if (ConsistsOf(text, "0123456789.") && std::count(text.begin(), text.end(), '.') == 1 && text.size() > 1 &&
+        setting.settings.GetDoubleValForVariable(setting.section, setting.name, real)) {
+        return {real};
     }
     return {text};
 }
@@ -134,20 +145,23 @@ std::string ReportShortCuts(Map const &properties, ReportLimits const &limits) {
 
 } // namespace
 
-KTVariant PropertiesOf(KTString const &settings) {
+KTVariant PropertiesOf(KTString const &text, KTSimpleIniFileReader &settings) {
     std::map<KTString, Map> sections;
     KTString section;
     std::size_t count = 0;
-    for (KTString const &line : settings.Split("\r\n")) {
-        KTString::size_type const equals = line.find('=');
-        if (line.empty() || line[0] == ';') {
-            continue;
-        }
-        if (line[0] == '[') {
-            section = line.substr(1, line.find(']') - 1);
-        } else if (equals != KTString::npos && equals != 0 && count < kMostProperties) {
-            sections[section][line.substr(0, equals)] = ValueOf(line.substr(equals + 1), section == kShortCutSection);
-            ++count;
+    for (KTString const &line : text.Split("\r\n")) {
+        KTString const start = line.substr(std::min(line.find_first_not_of(KTString(" \t")), line.size()));
+        KTString::size_type const equals = start.find('=', 1);
+        KTString::size_type const bracket = start.find(']');
+        if (!start.empty() && start[0] == '[' && bracket != KTString::npos) {
+            section = start.substr(1, bracket - 1) + start.substr(bracket + 1);
+        } else if (equals != KTString::npos && count < kMostProperties) {
+            KTString const name = start.substr(0, equals);
+            KTString value;
+            if (settings.GetStringValForVariable(section, name, value)) {
+                sections[section][name] = ValueOf({settings, section, name, value});
+                ++count;
+            }
         }
     }
     Map course;
@@ -168,8 +182,11 @@ std::string ReportProperties(CourseFolder const &folder, ReportLimits const &lim
         return "";
     }
     DiskBytes disk = DiskRead(file->path, kMostSettings);
-    bool const isCut = disk.size > disk.bytes.size();
-    KTVariant const course = PropertiesOf(DecodeText(std::move(disk.bytes), isCut).text);
+    if (!disk.problem.empty() || disk.size > disk.bytes.size()) {
+        return ""; // in use, a device, or too large to be settings
+    }
+    KTSimpleIniFileReader settings(file->path.GetPathAsKTString());
+    KTVariant const course = PropertiesOf(DecodeText(std::move(disk.bytes), false).text, settings);
     if (course.GetObject().empty()) {
         return "";
     }

@@ -1,6 +1,7 @@
 // CourseProperties.h: the library's variants and shortcuts at work on a course: its settings as typed properties.
 //
-// A course's settings are the first file whose name ends in ".ini". Its sections become objects, its keys properties:
+// A course's settings are the first file whose name ends in ".ini". The library's settings reader answers for a name; as
+// this host is shown files of any kind, it finds the names in the text. Sections become objects, variables properties:
 //
 //     (nothing)              undefined             0x1A                        int
 //     #1F6FA8                colour                1024                        int
@@ -11,13 +12,15 @@
 #pragma once
 
 #include "CourseFiles.h"
+#include "KTSimpleIniFileReader.h"
 #include "KTVariant.h"
 #include "Report.h"
 
 #include <string>
 
-/// The sections of a settings text as one object of objects. Keeps at most 10,000 properties.
-KTVariant PropertiesOf(KTString const &settings);
+/// The names that the settings text gives variables, each asked for in the reader: the sections as one object of
+/// objects. Keeps at most 10,000 properties.
+KTVariant PropertiesOf(KTString const &text, KTSimpleIniFileReader &settings);
 
 /// The properties with their kinds, and the shortcuts with their texts and their virtual keys. UTF-8, with titles and
 /// empty lines at the ends; empty if the course has no settings.

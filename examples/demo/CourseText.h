@@ -2,10 +2,11 @@
 //
 //     "KEY=TEXT"                  dictionary entry, quotes included; the key begins with $$$/
 //     smb://server/share/path     share URL, anywhere in a line
-//     START <tab> END <tab> TEXT  caption line, times in seconds; a bar may stand for the tab
+//     START <tab> END <tab> TEXT  caption line, times in seconds; bars may stand for the tabs
 
 #pragma once
 
+#include "KTPath.h"
 #include "KTString.h"
 
 #include <vector>
@@ -21,22 +22,22 @@ struct Cue {
     KTString text;
 };
 
-/// Collects entries and caption lines from the lines of one file. Keeps at most 10,000 of each: no course has more,
-/// and a file that only looks like one must not fill the memory.
+/// The captions of a file, read by the library's caption reader. At most 10,000, as no course has more.
+std::vector<Cue> ReadCues(KTPath const &file);
+
+/// Collects entries and share URLs from the lines of one file. Keeps at most 10,000 of each: a file that only looks like
+/// a course's must not fill the memory.
 class CourseTextCollector {
   public:
     void AddLine(KTString const &line);
 
     std::vector<DictionaryEntry> TakeEntries() { return std::move(m_Entries); }
     std::vector<KTString> TakeShares() { return std::move(m_Shares); }
-    std::vector<Cue> TakeCues() { return std::move(m_Cues); }
 
   private:
-    bool AddEntry(KTString const &line);
-    void AddCue(KTString const &line);
+    void AddEntry(KTString const &line);
     void AddShares(KTString const &line);
 
     std::vector<DictionaryEntry> m_Entries;
-    std::vector<Cue> m_Cues;
     std::vector<KTString> m_Shares;
 };

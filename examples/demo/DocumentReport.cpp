@@ -7,6 +7,7 @@
 #include "KTStreamUtil.h"
 #include "Table.h"
 
+#include <algorithm>
 #include <chrono>
 #include <memory>
 
@@ -48,6 +49,21 @@ class Steps {
                    {"Whole", Table::Align::Left}}};
 };
 
+// Checks the files against their digests; then again with one bit changed, which must show.
+std::string ReportDigestCheck(CourseDocument &document) {
+    DigestCheck const digests = document.CheckDigests();
+    std::string text = "  digests that are the stored ones: " + std::to_string(digests.right) + " of " +
+                       std::to_string(digests.checked) + "\n";
+    auto const file = std::find_if(document.files.begin(), document.files.end(),
+                                   [](DocumentFile const &one) { return !one.bytes.empty(); });
+    if (file != document.files.end()) {
+        file->bytes.back() ^= 1;
+        text += "  one changed bit is found: " + YesOrNo(document.CheckDigests().right + 1 == digests.right) + "\n";
+        file->bytes.back() ^= 1;
+    }
+    return text;
+}
+
 } // namespace
 
 std::string ReportDocument(CourseDocument &document) {
@@ -66,6 +82,7 @@ std::string ReportDocument(CourseDocument &document) {
         return clone != nullptr;
     });
     bool const isCloneSame = AreEqual(stream, clone);
+    std::string const digests = ReportDigestCheck(readBack);
     return "Document\n" + steps.Print() + "  read back and saved again, the document is the same: " + YesOrNo(isSame) +
-           "\n  the clone is the same: " + YesOrNo(isCloneSame) + "\n\n";
+           "\n  the clone is the same: " + YesOrNo(isCloneSame) + "\n" + digests + "\n";
 }

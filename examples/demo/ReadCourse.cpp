@@ -13,6 +13,8 @@
 
 namespace {
 
+constexpr KTUInt64 kMostCaptions = 4ULL << 20; // of a caption file
+
 KTString LastName(KTString const &name) {
     KTString::size_type const slash = name.rfind(static_cast<unsigned short>('/'));
     return slash == KTString::npos ? name : name.substr(slash + 1);
@@ -41,7 +43,9 @@ void ReadText(TextResult &result, int worker, RunLog &log) {
     CourseTextCollector collector;
     result.facts = ExamineText(decoded.text, [&](KTString const &line) { collector.AddLine(line); });
     result.entries = collector.TakeEntries();
-    result.cues = collector.TakeCues();
+    if (disk.size <= kMostCaptions) {
+        result.cues = ReadCues(result.file.path);
+    }
     result.shares = collector.TakeShares();
     if (result.facts.losslessPieces != result.facts.pieces) {
         result.notes.emplace_back("unpaired surrogates");
