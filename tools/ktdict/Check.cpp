@@ -11,38 +11,40 @@ using namespace orvik_private;
 
 namespace {
 
+void Add(LoadedFile const &file, char const *kind, std::optional<std::string_view> key, std::string_view detail,
+         Report &report) {
+    Finding finding;
+    finding.file = file.Path();
+    finding.kind = kind;
+    finding.key = key;
+    finding.detail = detail;
+    report.Add(finding);
+}
+
 // What the reading does not mind, but the author should.
+void CheckEntry(LoadedFile const &file, Entry const &entry, Report &report) {
+    if (!entry.hasKey || entry.key.empty()) {
+        std::string const number = std::to_string(entry.position + 1);
+        Add(file, "no-key", std::nullopt, "entry " + number + " has no key, so nobody finds it", report);
+        return;
+    }
+    if (!IsUtf8(entry.key) || entry.key.find('=') != std::string_view::npos) {
+        Add(file, "unfindable-key", entry.key,
+            "keys are looked up as UTF-8 and up to their first =, so nobody finds this one", report);
+    }
+    if (entry.text.find(static_cast<unsigned short>(0)) != UnitsView::npos) {
+        Add(file, "zero-in-text", entry.key, "the application gets the text up to its first zero", report);
+    }
+    if (!IsUtf16(entry.text)) {
+        Add(file, "unpaired-surrogate", entry.key, "the text has half of a character", report);
+    }
+}
+
 void CheckEntries(LoadedFile const &file, Report &report) {
-    file.ForEach([&](Entry const &entry) {
-        if (!entry.hasKey || entry.key.empty()) {
-            std::string const detail =
-                "entry " + std::to_string(entry.position + 1) + " has no key, so nobody finds it";
-            report.Add({.file = file.Path(), .kind = "no-key", .detail = detail});
-            return;
-        }
-        if (!IsUtf8(entry.key) || entry.key.find('=') != std::string_view::npos) {
-            report.Add({.file = file.Path(),
-                        .kind = "unfindable-key",
-                        .key = entry.key,
-                        .detail = "keys are looked up as UTF-8 and up to their first =, so nobody finds this one"});
-        }
-        if (entry.text.find(static_cast<unsigned short>(0)) != UnitsView::npos) {
-            report.Add({.file = file.Path(),
-                        .kind = "zero-in-text",
-                        .key = entry.key,
-                        .detail = "the application gets the text up to its first zero"});
-        }
-        if (!IsUtf16(entry.text)) {
-            report.Add({.file = file.Path(),
-                        .kind = "unpaired-surrogate",
-                        .key = entry.key,
-                        .detail = "the text has half of a character"});
-        }
-    });
+    file.ForEach([&](Entry const &entry) { CheckEntry(file, entry, report); });
     if (!file.OldEntries().empty()) {
-        report.Add({.file = file.Path(),
-                    .kind = "old-version",
-                    .detail = "the application does not find the entries of a file of version 1; convert it"});
+        Add(file, "old-version", std::nullopt,
+            "the application does not find the entries of a file of version 1; convert it", report);
     }
 }
 
@@ -52,7 +54,7 @@ void ReportMissing(LoadedFile const &in, LoadedFile const &from, char const *kin
     UnitsView text;
     in.ForEach([&](Entry const &entry) {
         if (entry.hasKey && !from.Find(entry.key, scratch, text)) {
-            report.Add({.file = named.Path(), .kind = kind, .key = entry.key, .detail = detail});
+            Add(named, kind, entry.key, detail, report);
         }
     });
 }

@@ -115,8 +115,8 @@ class Conversion {
         DictionaryReader const *content = &m_Input->Dictionary();
         if (MustCopy(*m_Input, m_Options)) {
             CopyEntries(*m_Input, m_Options, copy);
-            if (content->Locale()) {
-                copy.SetLocale(*content->Locale());
+            if (auto const &locale = content->Locale(); locale) {
+                copy.SetLocale(*locale);
             }
             content = &copy;
         }

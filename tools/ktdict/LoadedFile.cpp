@@ -184,8 +184,8 @@ void LoadedFile::Describe(JsonWriter &json) const {
     if (m_Facts.hasByteOrder) {
         json.String("byteOrder", m_Facts.isBig ? "big" : "little");
     }
-    if (m_Dictionary.Locale()) {
-        json.Key("locale", *m_Dictionary.Locale());
+    if (auto const &locale = m_Dictionary.Locale(); locale) {
+        json.Key("locale", *locale);
     }
     json.Boolean("isWhole", m_IsWhole);
     json.Number("entryCount", EntryCount());

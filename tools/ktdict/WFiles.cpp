@@ -51,7 +51,7 @@ std::wstring SystemName(std::string const &path) {
     if (!full || full->empty()) {
         return {};
     }
-    std::wstring const name = OUnitsToWide(full->data(), full->size());
+    std::wstring name = OUnitsToWide(full->data(), full->size());
     if (name.starts_with(L"\\\\?\\")) {
         return name;
     }
