@@ -10,7 +10,7 @@ stamps=$root/build/setup
 jobs=$(nproc)
 
 build_packages=(g++-mingw-w64-x86-64-posix mingw-w64-x86-64-dev binutils-mingw-w64-x86-64 cmake ninja-build
-    wine wine64 googletest libboost1.81-dev xz-utils bzip2)
+    wine wine64 googletest libboost1.81-dev libcli11-dev xz-utils bzip2)
 native_packages=(clang-19 libclang-rt-19-dev g++ libboost-thread1.81-dev)
 test_packages=(llvm-19)
 bench_packages=(libcereal-dev libspdlog-dev libfmt-dev libutfcpp-dev rapidjson-dev libsimpleini-dev)

@@ -1,6 +1,6 @@
 # What `cmake --install` puts into a prefix. Everything in it is relative to the prefix, which may be moved.
 #
-#     bin/                   KTPublic.dll and the compiler's run-time DLLs
+#     bin/                   KTPublic.dll, the compiler's run-time DLLs, and ktdict.exe (tools/CMakeLists.txt)
 #     lib/                   the import library
 #     lib/cmake/KTPublic/    the CMake package: find_package(KTPublic) gives KTPublic::KTPublic
 #     include/KTPublic/      the public headers
@@ -43,12 +43,12 @@ install(FILES ${CMAKE_BINARY_DIR}/KTPublicConfig.cmake ${CMAKE_BINARY_DIR}/KTPub
         DESTINATION ${kt_package_folder})
 
 install(FILES source/KTPublic.natvis DESTINATION ${CMAKE_INSTALL_DATADIR}/KTPublic)
-install(FILES docs/abi.md docs/licences.md DESTINATION ${kt_doc_folder})
+install(FILES docs/abi.md docs/ktdict.md docs/licences.md DESTINATION ${kt_doc_folder})
 install(FILES README.md DESTINATION ${kt_doc_folder} OPTIONAL)
 
 # The full texts, as the packages of the parts inside and beside the DLL bring them.
 if(CMAKE_CROSSCOMPILING)
-  foreach(package libboost1.81-dev gcc-mingw-w64-x86-64-posix-runtime mingw-w64-x86-64-dev)
+  foreach(package libboost1.81-dev libcli11-dev gcc-mingw-w64-x86-64-posix-runtime mingw-w64-x86-64-dev)
     set(copyright /usr/share/doc/${package}/copyright)
     if(EXISTS ${copyright})
       install(FILES ${copyright} DESTINATION ${kt_doc_folder}/copyright RENAME ${package}.txt)

@@ -40,6 +40,7 @@ file(RENAME ${installed} ${prefix})
 file(GLOB_RECURSE found LIST_DIRECTORIES FALSE RELATIVE ${prefix} ${prefix}/*)
 set(expected
     bin/KTPublic.dll
+    bin/ktdict.exe
     bin/libgcc_s_seh-1.dll
     bin/libstdc++-6.dll
     bin/libwinpthread-1.dll
@@ -50,6 +51,7 @@ set(expected
     lib/cmake/KTPublic/KTPublicTargets-${CONFIGURATION}.cmake
     share/KTPublic/KTPublic.natvis
     share/doc/KTPublic/abi.md
+    share/doc/KTPublic/ktdict.md
     share/doc/KTPublic/licences.md)
 file(GLOB headers RELATIVE ${SOURCE}/source/public/includes ${SOURCE}/source/public/includes/*.h)
 list(TRANSFORM headers PREPEND include/KTPublic/)
@@ -57,7 +59,7 @@ list(APPEND expected ${headers})
 if(EXISTS ${SOURCE}/README.md)
   list(APPEND expected share/doc/KTPublic/README.md)
 endif()
-foreach(package libboost1.81-dev gcc-mingw-w64-x86-64-posix-runtime mingw-w64-x86-64-dev)
+foreach(package libboost1.81-dev libcli11-dev gcc-mingw-w64-x86-64-posix-runtime mingw-w64-x86-64-dev)
   if(LAUNCHER AND EXISTS /usr/share/doc/${package}/copyright)
     list(APPEND expected share/doc/KTPublic/copyright/${package}.txt)
   endif()
@@ -113,6 +115,8 @@ if(LAUNCHER)
   file(READ ${WORK}/temp/ktap_log.txt log)
   expect("${log}" "^[0-9]+: written by the consumer\n$")
 endif()
+run(output ${LAUNCHER} ${prefix}/bin/ktdict.exe --version)
+expect("${output}" "^ktdict 1\\.0\\.0\n$")
 
 # Other major versions are refused.
 file(WRITE ${WORK}/later/CMakeLists.txt

@@ -1,8 +1,8 @@
-// DictionaryConversion.cpp: multibyte texts; UTF-8 through the file layer's string, which decodes it everywhere else.
+// DictionaryConversion.cpp: multibyte texts; UTF-8 as it is decoded everywhere else.
 
 #include "DictionaryConversion.h"
 
-#include "OString.h"
+#include "OUtf.h"
 
 #include <limits>
 
@@ -24,11 +24,11 @@ std::size_t ConvertMultibyte(int encoding, std::string_view bytes, unsigned shor
         throw TextConversionException(TextConversionException::kFailed);
     }
     if (encoding == kEncodingUtf8) {
-        OString const decoded = OString::FromUTF8(bytes);
+        KTUnits const decoded = OUtf8ToUnits(bytes);
         if (decoded.length() > capacity) {
             throw TextConversionException(TextConversionException::kBufferTooSmall);
         }
-        KTUnitTraits::copy(units, decoded.c_str(), decoded.length());
+        KTUnitTraits::copy(units, decoded.data(), decoded.length());
         return decoded.length();
     }
     std::int64_t const count = AnsiToUnits(bytes, units, capacity);
@@ -46,7 +46,7 @@ KTUnits MultibyteToUnits(int encoding, std::string_view bytes) {
         throw TextConversionException(TextConversionException::kFailed);
     }
     if (encoding == kEncodingUtf8) {
-        return OString::FromUTF8(bytes).GetUnits();
+        return OUtf8ToUnits(bytes);
     }
     KTUnits units(bytes.size(), 0); // no code page gives more units than bytes
     units.erase(ConvertMultibyte(encoding, bytes, units.data(), units.size()));
@@ -59,9 +59,8 @@ std::string UnitsToMultibyte(int encoding, UnitsView units, bool *lossy) {
     }
     std::string bytes;
     if (encoding == kEncodingUtf8) {
-        OString const text(units.data(), units.size());
-        bytes = text.GetUTF8();
-        if (lossy != nullptr && OString::FromUTF8(bytes) != text) {
+        bytes = OUnitsToUtf8(units.data(), units.size());
+        if (lossy != nullptr && UnitsView(OUtf8ToUnits(bytes)) != units) {
             *lossy = true; // an unpaired surrogate
         }
     } else if (!UnitsToAnsi(units, bytes, lossy)) {
