@@ -77,5 +77,6 @@ void AddExceptionBenchmarks();
 void AddDictionaryBenchmarks();
 void AddThreadBenchmarks();
 void AddServiceBenchmarks();
+void AddPictureBenchmarks();
 
 } // namespace bench

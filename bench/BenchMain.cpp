@@ -58,6 +58,7 @@ int main(int argc, char **argv) {
     bench::AddDictionaryBenchmarks();
     bench::AddThreadBenchmarks();
     bench::AddServiceBenchmarks();
+    bench::AddPictureBenchmarks();
 
     bench::Report report;
     if (benchmark::RunSpecifiedBenchmarks(&report) == 0) {

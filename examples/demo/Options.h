@@ -14,6 +14,10 @@ struct Options {
     bool crash = false; ///< crash while saving, instead of reading
     bool help = false;  ///< print the usage and nothing else
     std::string error;  ///< not empty: what is wrong with the command line
+    KTString report;    ///< where to write the page of pictures; empty: nowhere
+    bool all = false;   ///< print every row, however many
+    bool help = false;  ///< print the usage and nothing else
+    std::string error;  ///< not empty: what is wrong with the command line
 };
 
 /// Reads the arguments behind the program's name.
