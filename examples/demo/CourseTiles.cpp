@@ -9,6 +9,7 @@
 
 #include "KTException.h"
 #include "KTGraphicsUtils.h"
+#include "KTLogger.h"
 #include "KTTexturedQuad.h"
 #include "SoftRenderer.h"
 
@@ -73,6 +74,15 @@ std::optional<Canvas> ReadPicture(CoursePicture const &picture) {
     return soft::DecodePng(DiskRead(picture.path, kMostBytes).bytes);
 }
 
+// While it lives, nothing is logged: a refusal that the table shows is no news for the log.
+class LogPause {
+  public:
+    LogPause() { gKTLogger->LogEnableAtRuntime(false); }
+    LogPause(LogPause const &) = delete;
+    LogPause &operator=(LogPause const &) = delete;
+    ~LogPause() { gKTLogger->LogEnableAtRuntime(true); }
+};
+
 std::string ReasonOf(KTLCException const &refusal) {
     return refusal.GetFile().GetUTF8String() + ", line " + std::to_string(refusal.GetLine());
 }
@@ -81,6 +91,7 @@ std::string ReasonOf(KTLCException const &refusal) {
 std::vector<std::string> TryMachine(Machine const &machine, Canvas const &picture, Bgra const &pixels,
                                     PicturePage &page) {
     soft::Renderer const renderer(machine.limits);
+    LogPause const pause;
     try {
         KTLargeTexturedQuad3D const large = pixels.LoadedBy(renderer);
         Canvas drawn(pixels.width, pixels.height);

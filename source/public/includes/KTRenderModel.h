@@ -21,7 +21,7 @@ struct KT_PUBLIC_API KTRenderObject3D {
 };
 
 /// What a renderer draws, in this order.
-struct KT_PUBLIC_API KTPrimitiveRenderModel {
+struct KTPrimitiveRenderModel {
     std::vector<KTRenderObject3D> objects;
 };
 

@@ -8,8 +8,6 @@
 
 #include "KTTypes.h"
 
-#include "KTBeginExports.h"
-
 /// The bytes of a pixel, in the order of their addresses; one byte a channel, rows without padding. Four bytes. Any other
 /// number is no format.
 enum KTPixelFormatEnum : int {
@@ -22,7 +20,7 @@ enum KTPixelFormatEnum : int {
 
 /// A rectangle of a texture; four doubles, 32 bytes. Top lies on the top edge of the quad that shows it, so a top greater
 /// than the bottom shows the picture upside down.
-struct KT_PUBLIC_API KTTextureCoord2D {
+struct KTTextureCoord2D {
     double left = 0.0;
     double top = 0.0;
     double right = 1.0;
@@ -40,7 +38,7 @@ struct KT_PUBLIC_API KTTextureCoord2D {
 
 /// How pixels are to be uploaded; 16 bytes. The library sets the members that say so and hands on the others, whose
 /// meaning is the renderer's.
-struct KT_PUBLIC_API KTLoadTextureParams {
+struct KTLoadTextureParams {
     bool mipmaps = true;       ///< make mipmaps
     bool bordered = false;     ///< the outermost pixels on all four sides are a border
     bool rendererFlag = true;  ///< handed on
@@ -60,7 +58,7 @@ struct KT_PUBLIC_API KTLoadTextureParams {
 };
 
 /// What the renderer knows a texture by; 48 bytes. The renderer fills it in LoadTexture and gets it back as it was.
-struct KT_PUBLIC_API KTTexture2D {
+struct KTTexture2D {
     KTUInt32 id = 0; ///< the renderer's number; 0 in a record without a texture
     KTInt32 width = 0;
     KTInt32 height = 0;
@@ -79,5 +77,3 @@ struct KT_PUBLIC_API KTTexture2D {
     /// By the id alone, so that sets and maps hold each texture once.
     friend constexpr bool operator<(KTTexture2D const &a, KTTexture2D const &b) { return a.id < b.id; }
 };
-
-#include "KTEndExports.h"

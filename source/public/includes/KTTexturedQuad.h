@@ -49,7 +49,7 @@ struct KT_PUBLIC_API KTTexturedQuad3D {
 };
 
 /// The limits of a set of points; six floats, 24 bytes.
-struct KT_PUBLIC_API KTBoundingBox {
+struct KTBoundingBox {
     float minX = 3.4028235e38F;
     float maxX = 1.1754944e-38F;
     float minY = 3.4028235e38F;
