@@ -52,6 +52,7 @@
 //          0  virtual table                                                 24  the previous translator
 //          8  bool  crashed
 //         16  IKTExceptionHandler *
+//
 //     KTTextureCoord2D: f64 left, top, right, bottom
 //     KTBoundingBox: f32 least x, greatest x, least y, greatest y, least z, greatest z
 //
@@ -334,6 +335,8 @@ TEST(AbiLayoutTest, ShareUrlsAndConnectorsHaveTheirFieldsInOrder) {
     auto const *const kept = reinterpret_cast<KTString const *>(&connector);
     EXPECT_EQ(KTString("smb://no share"), *kept);
     EXPECT_FALSE(std::is_polymorphic_v<KTSmbUrl> || std::is_polymorphic_v<KTSMBConnector>);
+}
+
 TEST(AbiLayoutTest, TexturesHaveTheirFieldsInOrder) {
     ExpectWords<double>(KTTextureCoord2D(1, 2, 3, 4), 4, 1);
     ExpectWords<float>(KTBoundingBox(1, 2, 3, 4, 5, 6), 6, 1);
