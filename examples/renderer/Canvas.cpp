@@ -6,24 +6,10 @@
 #include <limits>
 #include <memory>
 
-// NOLINTBEGIN(bugprone-suspicious-include)
-#define STBI_ONLY_PNG
 #define STBI_NO_STDIO
-#define STB_IMAGE_STATIC
-#define STB_IMAGE_IMPLEMENTATION
 #define STBI_WRITE_NO_STDIO
-#define STB_IMAGE_WRITE_STATIC
-#define STB_IMAGE_WRITE_IMPLEMENTATION
-#if defined(__GNUC__)
-#pragma GCC diagnostic push
-#pragma GCC diagnostic ignored "-Wunused-function"
-#endif
 #include <stb/stb_image.h>
 #include <stb/stb_image_write.h>
-#if defined(__GNUC__)
-#pragma GCC diagnostic pop
-#endif
-// NOLINTEND(bugprone-suspicious-include)
 
 namespace soft {
 
