@@ -10,8 +10,8 @@ stamps=$root/build/setup
 jobs=$(nproc)
 
 build_packages=(g++-mingw-w64-x86-64-posix mingw-w64-x86-64-dev binutils-mingw-w64-x86-64 cmake ninja-build
-    wine wine64 googletest libboost1.81-dev libcli11-dev xz-utils bzip2)
-native_packages=(clang-19 libclang-rt-19-dev g++ libboost-thread1.81-dev)
+    wine wine64 googletest libboost1.81-dev libcli11-dev libstb-dev xz-utils bzip2)
+native_packages=(clang-19 libclang-rt-19-dev g++ libboost-thread1.81-dev libstb-dev)
 test_packages=(llvm-19)
 bench_packages=(libcereal-dev libspdlog-dev libfmt-dev libutfcpp-dev rapidjson-dev libsimpleini-dev)
 lint_packages=(clang-19 clang-format-19 clang-tidy-19)
@@ -21,8 +21,8 @@ usage() {
 usage: ./kt COMMAND
 
   demo [--crash] [FOLDER]
-                        run the demo host on examples/course/, or on FOLDER; with --crash it faults while it saves, and
-                        LLVM's obj2yaml reads its crash dump
+                        run the demo host on examples/course/, or on FOLDER; its pictures are in build/demo/index.html;
+                        with --crash it faults while it saves, and LLVM's obj2yaml reads its crash dump
   test [CTEST-ARGS]     every test; the arguments go to ctest, for example -L strings
   build                 build/windows/bin/ and build/windows/lib/
   crash-campaign [COUNT]
@@ -203,7 +203,7 @@ command_demo() {
     if [ -n "$crash" ]; then
         demo_crash "$folder"
     else
-        "$root/cmake/wine-run" "$root/build/windows/bin/ktdemo.exe" "$folder"
+        "$root/cmake/wine-run" "$root/build/windows/bin/ktdemo.exe" "--report=$root/build/demo" "$folder"
     fi
 }
 

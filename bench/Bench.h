@@ -78,5 +78,6 @@ void AddDictionaryBenchmarks();
 void AddThreadBenchmarks();
 void AddServiceBenchmarks();
 void AddReaderBenchmarks();
+void AddPictureBenchmarks();
 
 } // namespace bench

@@ -59,6 +59,7 @@ int main(int argc, char **argv) {
     bench::AddThreadBenchmarks();
     bench::AddServiceBenchmarks();
     bench::AddReaderBenchmarks();
+    bench::AddPictureBenchmarks();
 
     bench::Report report;
     if (benchmark::RunSpecifiedBenchmarks(&report) == 0) {

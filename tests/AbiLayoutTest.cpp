@@ -52,6 +52,26 @@
 //          0  virtual table                                                 24  the previous translator
 //          8  bool  crashed
 //         16  IKTExceptionHandler *
+//
+//     KTTextureCoord2D: f64 left, top, right, bottom
+//     KTBoundingBox: f32 least x, greatest x, least y, greatest y, least z, greatest z
+//
+//     KTLoadTextureParams, 16 bytes            KTTexture2D, 48 bytes
+//          0  bool  mipmaps                         0  u32  id
+//          1  bool  bordered                        4  i32  width
+//          2  bool  the renderer's                  8  i32  height
+//          3  bool  no mipmaps                     16  f64  two of the renderer's
+//          4  i32   the renderer's                 32  KTLoadTextureParams
+//          8  i32   row length
+//         12  i32   pixel format
+//
+//     KTTexturedQuad3D, 96 bytes               KTRendererInitializationParams, 6 texts of 32 bytes each, then
+//          0  KTQuad3D                            192  i32
+//         48  std::vector<KTTexture2D>            196  KTColor4f
+//         72  std::vector<KTTextureCoord2D>       212  bool
+//     KTLargeTexturedQuad3D: std::vector<KTTexturedQuad3D>
+//     KTRenderObject3D: KTTexturedQuad3D, KTTransform; KTLargeRenderObject3D: KTLargeTexturedQuad3D, KTTransform
+//     KTPrimitiveRenderModel: std::vector<KTRenderObject3D>; KTCompositeRenderModel: std::vector<KTLargeRenderObject3D>
 
 #include "KTPublic.h"
 #include "VTable.h"
@@ -327,7 +347,70 @@ TEST(AbiLayoutTest, ShareUrlsAndConnectorsHaveTheirFieldsInOrder) {
     EXPECT_FALSE(std::is_polymorphic_v<KTSmbUrl> || std::is_polymorphic_v<KTSMBConnector>);
 }
 
+TEST(AbiLayoutTest, TexturesHaveTheirFieldsInOrder) {
+    ExpectWords<double>(KTTextureCoord2D(1, 2, 3, 4), 4, 1);
+    ExpectWords<float>(KTBoundingBox(1, 2, 3, 4, 5, 6), 6, 1);
+    for (std::size_t flag = 0; flag < 4; ++flag) {
+        KTLoadTextureParams const params(flag == 0, flag == 1, flag == 2, flag == 3, 5, 6, kKTPixelFormatAlpha8);
+        EXPECT_EQ(16U, sizeof params);
+        EXPECT_EQ(1U << (8 * flag), ValueAt<KTUInt32>(&params, 0));
+        EXPECT_EQ(5, ValueAt<int>(&params, 4));
+        EXPECT_EQ(6, ValueAt<int>(&params, 8));
+        EXPECT_EQ(3, ValueAt<int>(&params, 12));
+    }
+    KTTexture2D const texture(1, 2, 3, 4, 5);
+    EXPECT_EQ(48U, sizeof texture);
+    EXPECT_TRUE(std::is_trivially_copyable_v<KTTexture2D>);
+    EXPECT_EQ(1U, ValueAt<KTUInt32>(&texture, 0));
+    EXPECT_EQ(2, ValueAt<int>(&texture, 4));
+    EXPECT_EQ(3, ValueAt<int>(&texture, 8));
+    EXPECT_EQ(4.0, ValueAt<double>(&texture, 16));
+    EXPECT_EQ(5.0, ValueAt<double>(&texture, 24));
+    EXPECT_EQ(0x00010001U, ValueAt<KTUInt32>(&texture, 32));
+    EXPECT_EQ(4, ValueAt<int>(&texture, 44));
+}
+
+TEST(AbiLayoutTest, QuadsAndModelsHaveTheirFieldsInOrder) {
+    KTTexturedQuad3D quad;
+    quad.textures.resize(1);
+    quad.textureCoords.resize(1);
+    EXPECT_EQ(96U, sizeof quad);
+    EXPECT_EQ(static_cast<void *>(quad.textures.data()), PointerAt(&quad, 48));
+    EXPECT_EQ(static_cast<void *>(quad.textureCoords.data()), PointerAt(&quad, 72));
+    KTLargeTexturedQuad3D large;
+    large.quads.resize(1);
+    EXPECT_EQ(24U, sizeof large);
+    EXPECT_EQ(static_cast<void *>(large.quads.data()), PointerAt(&large, 0));
+    KTTransform const transform(KTMatrix4x4f(), {0.25F, 0, 0, 0});
+    KTRenderObject3D const object(quad, transform);
+    EXPECT_EQ(96U + 80U, sizeof object);
+    EXPECT_EQ(0.25F, ValueAt<float>(&object, 96 + 64));
+    KTLargeRenderObject3D const largeObject(large, transform);
+    EXPECT_EQ(24U + 80U, sizeof largeObject);
+    EXPECT_EQ(0.25F, ValueAt<float>(&largeObject, 24 + 64));
+    EXPECT_EQ(24U, sizeof(KTPrimitiveRenderModel));
+    EXPECT_EQ(24U, sizeof(KTCompositeRenderModel));
+    KTRendererInitializationParams params;
+    params.color = {0.5F, 0, 0, 1};
+    params.flag = true;
+    EXPECT_EQ(216U, sizeof params);
+    EXPECT_EQ(static_cast<void *>(&params), static_cast<void *>(&params.text0));
+    EXPECT_EQ(&params.text0 + 5, &params.text5);
+    EXPECT_EQ(256, ValueAt<int>(&params, 192));
+    EXPECT_EQ(0.5F, ValueAt<float>(&params, 196));
+    EXPECT_EQ(1, ValueAt<char>(&params, 212));
+}
+
 TEST(AbiLayoutTest, NumbersAreFixed) {
+    EXPECT_EQ(0, static_cast<int>(kKTPixelFormatRGB));
+    EXPECT_EQ(1, static_cast<int>(kKTPixelFormatBGR));
+    EXPECT_EQ(2, static_cast<int>(kKTPixelFormatBGRA));
+    EXPECT_EQ(3, static_cast<int>(kKTPixelFormatAlpha8));
+    EXPECT_EQ(4U, sizeof(KTPixelFormatEnum));
+    EXPECT_EQ(1, static_cast<int>(kKTFeatureNPOT));
+    EXPECT_EQ(2, static_cast<int>(kKTFeatureMipmaps));
+    EXPECT_EQ(512, static_cast<int>(kKTFeatureTextureBorder));
+    EXPECT_EQ(4U, sizeof(KTRendererFeatureEnum));
     EXPECT_EQ(0, static_cast<int>(kKTInterpolationLinear));
     EXPECT_EQ(1, static_cast<int>(kKTInterpolationEaseInEaseOut));
     EXPECT_EQ(4U, sizeof(KTInterpolationModeEnum));

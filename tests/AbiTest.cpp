@@ -40,6 +40,8 @@ VTableRow const kTables[] = {
          "KTColor::SetColorData(KTColor::ColorSpaceEnum, std::vector<KTReal, std::allocator<KTReal> > const&)",
          "KTColor::SetColorData(std::vector<KTReal, std::allocator<KTReal> > const&)",
          "KTColor::IsEqual(KTColor const*) const"}),
+    VTableOf<KTTextureManager>({"pure ~", "pure", "pure", "pure"}),
+    VTableOf<IKTRenderer>({"pure ~", "pure", "pure"}),
     VTableOf<KTFile>({"~", "KTFile::PathChanged(OString const&)"}),
     VTableOf<IKTStringDictionary>({"pure ~", "pure", "pure", "pure", "pure", "pure"}),
     VTableOf<KTStringDictionary>(
@@ -318,6 +320,14 @@ TEST(AbiTest, HostsCallTheLoggersSlotsByTheSameEntries) {
     EXPECT_EQ(1U, EntryOf<void (KTLogger::*)(wchar_t const *, ...)>(&KTLogger::Log));
     EXPECT_EQ(2U, EntryOf<void (KTLogger::*)(std::string const &)>(&KTLogger::Log));
     EXPECT_EQ(3U, EntryOf<void (KTLogger::*)(char const *, ...)>(&KTLogger::Log));
+}
+
+TEST(AbiTest, LibraryCallsTheRenderersSlotsByTheseEntries) {
+    EXPECT_EQ(2U, EntryOf(&KTTextureManager::GetMaxTextureSize));
+    EXPECT_EQ(3U, EntryOf(&KTTextureManager::LoadTexture));
+    EXPECT_EQ(4U, EntryOf(&KTTextureManager::ReleaseTexture));
+    EXPECT_EQ(2U, EntryOf(&IKTRenderer::IsFeatureSupported));
+    EXPECT_EQ(3U, EntryOf(&IKTRenderer::GetTextureManager));
 }
 
 TEST(AbiTest, DerivedDestructorsRunThroughTheFirstSlot) {

@@ -341,6 +341,49 @@ TEST_F(Demo, TheSystemIsDescribed) {
     EXPECT_EQ(outcome.Row("the folder"), "the folder is on this machine");
 }
 
+TEST_F(Demo, CoursesWidestPictureIsCutIntoTexturesAndShownWhole) {
+    Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
+    EXPECT_TRUE(outcome.Has("\nTextures of pictures/panorama.png\n"));
+    EXPECT_EQ(outcome.Row("4096, any size"), "4096, any size 1 4800000 the picture");
+    EXPECT_EQ(outcome.Row("1024, any size"), "1024, any size 3 4833648 the picture");
+    EXPECT_EQ(outcome.Row("512, powers of two"), "512, powers of two 30 4904480 the picture");
+    EXPECT_EQ(outcome.Row("128, powers of two"), "128, powers of two 104 4980864 the picture");
+    EXPECT_EQ(outcome.Row("1024, no borders"), "1024, no borders - - refused: KTGraphicsStructs, line 484");
+    EXPECT_FALSE(outcome.Has("pictures: ")) << "no page without --report";
+}
+
+TEST_F(Demo, PageOfPicturesIsWritten) {
+    fs::path const page = m_Work / u8"new" / u8"Seite €";
+    Outcome const outcome = CheckEmptyError(Run(L"\"--report=" + page.wstring() + L"\" \"" KT_COURSE L"\""));
+    EXPECT_EQ(outcome.status, 0U);
+    EXPECT_TRUE(outcome.Has("\\new\\Seite €\\index.html\n")) << outcome.out;
+    std::string const html = ReadAll(page / "index.html");
+    EXPECT_TRUE(html.starts_with("<!DOCTYPE html>\n"));
+    EXPECT_TRUE(html.ends_with("</html>\n"));
+    for (std::string const name : {"tiles-4096-any", "tiles-1024-any", "tiles-512-powers", "tiles-128-powers", "whole",
+                                   "faded", "frame-0", "frame-20", "frame-40", "frame-60", "frame-80", "frame-100"}) {
+        EXPECT_NE(html.find("<img src=\"" + name + ".png\" width="), std::string::npos) << name;
+        EXPECT_TRUE(ReadAll(page / (name + ".png")).starts_with("\x89PNG\r\n")) << name;
+    }
+    EXPECT_FALSE(fs::exists(page / "tiles-1024-no-borders.png"));
+}
+
+TEST_F(Demo, PageThatCannotBeWrittenIsNoted) {
+    Write("used", "a file, not a folder");
+    Outcome const outcome =
+        CheckEmptyError(Run(Quoted(L"--report=" + (m_Folder / "used").wstring()) + L" \"" KT_COURSE L"\""));
+    EXPECT_EQ(outcome.status, 0U);
+    EXPECT_TRUE(outcome.Has("  the page of pictures could not be written: ")) << outcome.out;
+}
+
+TEST_F(Demo, DamagedAndHugePicturesAreNotCut) {
+    std::string const start = "\x89PNG\r\n\x1A\n\0\0\0\x0DIHDR"s;
+    Write("cut.png", start + "\0\0\0\2\0\0\0\2"s);
+    EXPECT_TRUE(CheckEmptyError(RunOnFolder()).Has("\nTextures of cut.png\n  the picture is damaged or too large\n"));
+    Write("huge.png", start + "\xFF\xFF\xFF\xFF\0\0\0\1"s);
+    EXPECT_TRUE(CheckEmptyError(RunOnFolder()).Has("\nTextures of huge.png\n  the picture is damaged or too large\n"));
+}
+
 TEST_F(Demo, CourseChecksAllHold) {
     Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
     EXPECT_EQ(outcome.Row("pieces unchanged by UTF-8"), "pieces unchanged by UTF-8 and back 6 of 6");
@@ -557,7 +600,7 @@ TEST_F(Demo, HugeFileIsCutBetweenCharacters) {
 TEST_F(Demo, HelpAndWrongUsage) {
     Outcome const help = CheckEmptyError(Run(L"--help"));
     EXPECT_EQ(help.status, 0U);
-    EXPECT_TRUE(help.out.starts_with("usage: ktdemo [--all | --crash] [FOLDER]\n"));
+    EXPECT_TRUE(help.out.starts_with("usage: ktdemo [--all | --crash] [--report=FOLDER] [FOLDER]\n"));
     for (wchar_t const *arguments : {L"--bogus", L"one two"}) {
         Outcome const outcome = Run(arguments);
         EXPECT_EQ(outcome.status, 2U);

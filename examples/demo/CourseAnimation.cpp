@@ -7,7 +7,6 @@
 
 #include "CourseAnimation.h"
 
-#include "KTAnimation.h"
 #include "KTInterpolator.h"
 #include "KTIntRect.h"
 #include "KTReal.h"
@@ -18,49 +17,15 @@
 
 namespace {
 
-constexpr float kStageWidth = 1024;
-constexpr float kStageHeight = 640;
-constexpr int kLastFrame = 100;
 constexpr int kFramesBetweenRows = 10;
 constexpr std::size_t kNameWidth = 60;
 
-struct Picture {
-    std::string name;
-    PictureSize size;
-};
-
-// The widest picture of the course; without a name if no picture can be read.
-Picture WidestPicture(CourseFolder const &folder) {
-    Picture widest;
-    for (CourseFile const &file : folder.files) {
-        PictureSize const size = file.kind == FileKind::Picture ? ReadPictureSize(file.path) : PictureSize();
-        if (size.problem.empty() && size.width > widest.size.width && size.height != 0) {
-            widest = {PrintableTail(file.name, kNameWidth), size};
-        }
-    }
-    return widest;
-}
-
 // The picture as high as the stage, centred at the origin, as the renderer's quads are.
 KTQuad3D QuadOf(PictureSize const &size) {
-    float const scale = kStageHeight / static_cast<float>(size.height);
+    float const scale = float{kStageHeight} / static_cast<float>(size.height);
     float const x = static_cast<float>(size.width) * scale / 2;
-    float const y = kStageHeight / 2;
+    float const y = float{kStageHeight} / 2;
     return {{-x, -y, 0}, {x, -y, 0}, {x, y, 0}, {-x, y, 0}};
-}
-
-KTAnimation ScrollOf(KTQuad3D const &quad) {
-    // To the right until its left edge is at the stage's left edge; the other end by the same way to the left.
-    float const way = (quad.Width() - kStageWidth) / 2;
-    auto const at = [](float x, float alpha) {
-        return KTTransform(KTMatrix4x4f::Translation({x, 0, 0}), {1, 1, 1, alpha});
-    };
-    KTAnimation animation;
-    animation.AddKeyframe({at(way, 0), 0});
-    animation.AddKeyframe({at(way, 1), kLastFrame / 4});
-    animation.AddKeyframe({at(-way, 1), kLastFrame * 3 / 4});
-    animation.AddKeyframe({at(-way, 0), kLastFrame});
-    return animation;
 }
 
 // While it lives, interpolation is done in that way.
@@ -98,8 +63,33 @@ std::vector<std::string> CellsOf(KTTransform const &transform, KTQuad3D const &q
 
 } // namespace
 
+CoursePicture WidestPicture(CourseFolder const &folder) {
+    CoursePicture widest;
+    for (CourseFile const &file : folder.files) {
+        PictureSize const size = file.kind == FileKind::Picture ? ReadPictureSize(file.path) : PictureSize();
+        if (size.problem.empty() && size.width > widest.size.width && size.height != 0) {
+            widest = {PrintableTail(file.name, kNameWidth), file.path, size};
+        }
+    }
+    return widest;
+}
+
+KTAnimation ScrollOf(KTQuad3D const &quad) {
+    // To the right until its left edge is at the stage's left edge; the other end by the same way to the left.
+    float const way = (quad.Width() - float{kStageWidth}) / 2;
+    auto const at = [](float x, float alpha) {
+        return KTTransform(KTMatrix4x4f::Translation({x, 0, 0}), {1, 1, 1, alpha});
+    };
+    KTAnimation animation;
+    animation.AddKeyframe({at(way, 0), 0});
+    animation.AddKeyframe({at(way, 1), kLastFrame / 4});
+    animation.AddKeyframe({at(-way, 1), kLastFrame * 3 / 4});
+    animation.AddKeyframe({at(-way, 0), kLastFrame});
+    return animation;
+}
+
 std::string ReportAnimation(CourseFolder const &folder) {
-    Picture const picture = WidestPicture(folder);
+    CoursePicture const picture = WidestPicture(folder);
     if (picture.name.empty()) {
         return "";
     }

@@ -3,7 +3,7 @@
 #include "Options.h"
 
 char const *UsageText() {
-    return "usage: ktdemo [--all | --crash] [FOLDER]\n"
+    return "usage: ktdemo [--all | --crash] [--report=FOLDER] [FOLDER]\n"
            "\n"
            "Reads every text file below FOLDER (here: the current folder) with the KTPublic library and prints what "
            "it\n"
@@ -17,10 +17,18 @@ char const *UsageText() {
            "what "
            "the\n"
            "            library keeps: the work as a .ktbak file, and a crash dump\n"
+           "  --report=FOLDER\n"
+           "            write a page of pictures to FOLDER, index.html\n"
            "  --help    print this text\n"
            "\n"
            "Exit status: 0 done, 1 no such folder, nothing readable in it, or --crash, 2 wrong usage.\n";
 }
+
+namespace {
+
+constexpr char kReport[] = "--report=";
+
+} // namespace
 
 Options ParseOptions(std::vector<KTString> const &arguments) {
     Options options;
@@ -36,6 +44,8 @@ Options ParseOptions(std::vector<KTString> const &arguments) {
             options.all = true;
         } else if (isOption && argument == "--crash") {
             options.crash = true;
+        } else if (isOption && argument.GetUTF8String().starts_with(kReport)) {
+            options.report = argument.substr(sizeof kReport - 1);
         } else if (isOption) {
             options.error = "unknown option: " + argument.GetUTF8String();
         } else if (hasFolder) {

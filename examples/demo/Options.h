@@ -10,6 +10,7 @@
 /// What the command line asks for.
 struct Options {
     KTString folder = ".";
+    KTString report;    ///< where to write the page of pictures; empty: nowhere
     bool all = false;   ///< print every row, however many
     bool crash = false; ///< crash while saving, instead of reading
     bool help = false;  ///< print the usage and nothing else

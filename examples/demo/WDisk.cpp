@@ -163,3 +163,12 @@ bool DiskTouch(KTPath const &file) {
     return Owned<FileHandle>(CreateFileW(Extended(file).c_str(), GENERIC_READ | GENERIC_WRITE, kShareAll, nullptr,
                                          OPEN_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr)) != nullptr;
 }
+
+bool DiskWrite(KTPath const &file, std::string const &bytes) {
+    FileHandle const handle = Owned<FileHandle>(CreateFileW(Extended(file).c_str(), GENERIC_WRITE, FILE_SHARE_READ,
+                                                            nullptr, CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr));
+    DWORD written = 0;
+    return handle != nullptr && bytes.size() <= MAXDWORD &&
+           WriteFile(handle.get(), bytes.data(), static_cast<DWORD>(bytes.size()), &written, nullptr) != FALSE &&
+           written == bytes.size();
+}

@@ -53,3 +53,6 @@ DiskBytes DiskRead(KTPath const &file, KTUInt64 limit);
 
 /// Creates the file if it is not there. Returns whether it is there now.
 bool DiskTouch(KTPath const &file);
+
+/// Creates the file anew with these bytes. Returns whether all of them are in it.
+bool DiskWrite(KTPath const &file, std::string const &bytes);

@@ -3,12 +3,13 @@
 
 #include "CourseAnimation.h"
 #include "CourseCopy.h"
-#include "CourseDigests.h"
 #include "CourseDictionary.h"
+#include "CourseDigests.h"
 #include "CourseFiles.h"
-#include "CourseProperties.h"
-#include "DocumentReport.h"
 #include "CourseMail.h"
+#include "CourseProperties.h"
+#include "CourseTiles.h"
+#include "DocumentReport.h"
 #include "Options.h"
 #include "ReadCourse.h"
 #include "Report.h"
@@ -80,6 +81,7 @@ int Run(Console const &console, Options const &options) {
     console.Print(ReportOtherFiles(folder, limits));
     console.Print(ReportAnimation(folder));
     console.Print(ReportDigests(folder, limits));
+    console.Print(ReportTiles(folder, options.report.empty() ? KTPath() : DiskFullPath(options.report)));
     {
         CourseCopy const copy(path); // gone again before the run ends
         log.Step("copied to the session folder");

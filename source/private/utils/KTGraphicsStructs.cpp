@@ -1,16 +1,19 @@
-// KTGraphicsStructs.cpp: the interpolator, vectors, colours, planes, quads and transforms. Matrices are in
-// KTMatrix4x4f.cpp.
+// KTGraphicsStructs.cpp: the interpolator, vectors, colours, planes, quads and transforms, and the reports of all graphics
+// structures. Matrices are in KTMatrix4x4f.cpp, textured quads in KTTexturedQuad.cpp.
 
 #include "KTGraphicsStructs.h"
 
 #include "KTException.h"
+#include "KTGraphicsReport.h"
 #include "KTInterpolator.h"
+#include "KTLogger.h"
 #include "KTVector3d.h"
 
 #include <bit>
 #include <cmath>
 #include <cstdint>
 #include <limits>
+#include <string>
 
 namespace {
 
@@ -25,7 +28,7 @@ bool IsModeLinear() {
     case kKTInterpolationEaseInEaseOut:
         return false;
     }
-    throw KTLCException(kKTErrorInternal, kReportPath, 47, false);
+    KTFailGraphics(nullptr, 47);
 }
 
 // The parts of the way at which the pieces of the eased curve meet, and the area under its speed when that rises by 1 in
@@ -52,7 +55,7 @@ static_assert(std::bit_cast<std::uint32_t>(Easing<float>::kCruise) == 0x3ECCCCCC
 
 template <typename Number> Number Linear(Number from, Number to, Number t) {
     if (!(t >= 0 && t <= 1)) {
-        throw KTLCException(kKTErrorInternal, kReportPath, 87, false);
+        KTFailGraphics(nullptr, 87);
     }
     return (to - from) * t + from;
 }
@@ -100,6 +103,19 @@ template <float KTVector3f::*kCoordinate> float Greatest(KTQuad3D const &quad) {
 }
 
 } // namespace
+
+// ---- reports ----
+
+void KTLogGraphics(char const *text) {
+    if (text != nullptr && gKTLogger->IsLogEnabled()) {
+        gKTLogger->Log(std::string(text));
+    }
+}
+
+void KTFailGraphics(char const *text, int line) {
+    KTLogGraphics(text);
+    throw KTLCException(kKTErrorInternal, kReportPath, line, false);
+}
 
 // ---- KTInterpolator ----
 
