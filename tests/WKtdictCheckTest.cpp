@@ -6,6 +6,9 @@ using namespace dictionary_files;
 
 namespace {
 
+constexpr wchar_t kEnglish[] = KT_COURSE "/strings/en_US.txt";
+constexpr wchar_t kGerman[] = KT_COURSE "/strings/de_DE.txt";
+
 class KtdictCheckTest : public KtdictTest {
   protected:
     // The problems of these files, one a line, without the count at the end.
@@ -36,7 +39,7 @@ TEST_F(KtdictCheckTest, AGoodFileHasNone) {
     EXPECT_EQ(Lines(), Check({L"a.txt"}));
     Write(L"a.lxdc", SmallFile().Bytes());
     EXPECT_EQ(Lines(), Check({L"a.lxdc"}));
-    EXPECT_EQ(Lines(), Check({KT_COURSE "/strings/en_US.txt", KT_COURSE "/strings/de_DE.txt"}));
+    EXPECT_EQ(Lines(), Check({kEnglish, kGerman}));
 }
 
 TEST_F(KtdictCheckTest, LinesOfATextFile) {
@@ -189,9 +192,7 @@ TEST_F(KtdictCheckTest, Json) {
     EXPECT_EQ("unfindable-key", problems[4]["kind"].text);
     EXPECT_EQ("2FDC", problems[4]["keyBytes"].text);
     EXPECT_EQ("extra-key", problems[5]["kind"].text);
-    EXPECT_EQ(
-        0U,
-        Run({L"check", L"--format", L"json", L"--", KT_COURSE "/strings/en_US.txt"}).Json()["problems"].items.size());
+    EXPECT_EQ(0U, Run({L"check", L"--format", L"json", L"--", kEnglish}).Json()["problems"].items.size());
 }
 
 } // namespace

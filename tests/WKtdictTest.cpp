@@ -6,8 +6,6 @@ using namespace dictionary_files;
 
 namespace {
 
-using std::string_literals::operator""s;
-
 class KtdictCommandLineTest : public KtdictTest {};
 class KtdictDumpTest : public KtdictTest {};
 class KtdictGetTest : public KtdictTest {};

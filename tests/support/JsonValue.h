@@ -3,6 +3,7 @@
 
 #pragma once
 
+#include <algorithm>
 #include <cstdint>
 #include <cstdlib>
 #include <stdexcept>
@@ -16,24 +17,17 @@ struct JsonValue {
     enum Kind { Null, Boolean, Number, String, Array, Object } kind = Null;
     bool boolean = false;
     double number = 0;
-    std::string text; ///< UTF-8
-    std::vector<JsonValue> items;
-    std::vector<std::pair<std::string, JsonValue>> members;
+    std::string text;               ///< UTF-8
+    std::vector<JsonValue> items;   ///< of an array, or the values of an object's members
+    std::vector<std::string> names; ///< of the members
 
-    bool Has(std::string_view name) const {
-        for (auto const &member : members) {
-            if (member.first == name) {
-                return true;
-            }
-        }
-        return false;
-    }
+    bool Has(std::string_view name) const { return std::find(names.begin(), names.end(), name) != names.end(); }
 
     /// A member; throws std::runtime_error if there is none.
     JsonValue const &operator[](std::string_view name) const {
-        for (auto const &member : members) {
-            if (member.first == name) {
-                return member.second;
+        for (std::size_t i = 0; i < names.size(); ++i) {
+            if (names[i] == name) {
+                return items[i];
             }
         }
         throw std::runtime_error("no member " + std::string(name));
@@ -165,7 +159,8 @@ class JsonReader {
             if (value.Has(name)) {
                 Fail("a name twice");
             }
-            value.members.emplace_back(std::move(name), Value());
+            value.names.push_back(std::move(name));
+            value.items.push_back(Value());
         } while (TakeIf(','));
         Expect('}');
     }
