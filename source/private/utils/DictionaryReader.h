@@ -126,6 +126,9 @@ class DictionaryReader {
     /// The first part of that for a name alone: here, then in the default dictionary. False if neither has it.
     bool LookupName(std::string_view name, KTUnits &scratch, UnitsView &text) const;
 
+    /// The same, the text as the bytes of its units, which may begin at an odd address: nothing is copied for that.
+    bool LookupBytes(std::string_view name, KTUnits &scratch, std::string_view &bytes) const;
+
     FastArray const &Array() const noexcept { return *m_Array; }
     LegacyTable const &Legacy() const noexcept { return m_Legacy; }
 
@@ -134,6 +137,9 @@ class DictionaryReader {
     /// Adds what the source holds, whatever its form. Malformed input raises nothing: the valid flag is cleared, and
     /// what was read before the trouble stays. Throws std::bad_alloc.
     void Read(ByteSource &source, DictionaryObserver *observer = nullptr);
+
+    /// Copies what lies in files that are in use, so that they can be deleted and written again. Throws std::bad_alloc.
+    void LetFilesGo() { m_Array->LetFilesGo(); }
 
     /// Writes the entries of the FastArray and returns the number of bytes written. What the sink throws, or an entry
     /// that the form cannot hold, ends the writing: "Serialize2" and ": Caught exception" go to the standard error,
@@ -160,7 +166,7 @@ class DictionaryReader {
     friend class DictionaryBinaryReader; // the forms' own files work on the stores directly
     friend class DictionaryTextReader;
 
-    bool FindValue(std::string_view name, KTUnits &scratch, UnitsView &text) const;
+    bool FindBytes(std::string_view name, KTUnits &scratch, std::string_view &bytes) const;
     void WriteForm(ByteSink &sink, DictionaryForm const &form, DictionaryObserver *observer) const;
 
     DictionaryVersion m_Version;

@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <array>
+#include <cstring>
 #include <new>
 
 using orvik_private::DictionaryForm;
@@ -73,23 +74,33 @@ void WidenSigned(std::string_view bytes, KTString &target) {
     }
 }
 
-// The text up to its first zero.
-UnitsView UpToZero(UnitsView text) {
+// Appends units, which may begin at an odd address, up to the first zero among them.
+void AppendUpToZero(std::string_view bytes, KTString &target) {
+    constexpr std::size_t kUnit = sizeof(unsigned short);
     constexpr std::size_t kAtOnce = 16;
-    std::size_t at = 0;
-    for (; at + kAtOnce <= text.size(); at += kAtOnce) {
+    std::size_t const count = bytes.size() / kUnit;
+    if (count == 0) {
+        return;
+    }
+    std::size_t at = target.size();
+    target.append(count, 0);
+    unsigned short const *const units = &target[0];
+    std::memcpy(&target[at], bytes.data(), count * kUnit);
+    for (; at + kAtOnce <= target.size(); at += kAtOnce) {
         bool hasZero = false;
         for (std::size_t i = 0; i < kAtOnce; ++i) {
-            hasZero |= text[at + i] == 0;
+            hasZero |= units[at + i] == 0;
         }
         if (hasZero) {
             break;
         }
     }
-    while (at < text.size() && text[at] != 0) {
+    while (at < target.size() && units[at] != 0) {
         ++at;
     }
-    return text.substr(0, at);
+    if (at < target.size()) {
+        target.erase(at);
+    }
 }
 
 } // namespace
@@ -148,21 +159,30 @@ KTString KTStringDictionary::GetKeyValue(KTString const &key) {
     KeyBytes const bytes(key);
     orvik_private::KeyText const parts = orvik_private::SplitKeyText(bytes.Get());
     KTUnits scratch;
-    UnitsView text;
-    if (!m_Dictionary->LookupName(parts.name, scratch, text)) {
+    std::string_view text;
+    if (!m_Dictionary->LookupBytes(parts.name, scratch, text)) {
         if (!parts.name.empty() && IsPlain(parts.defaultText)) {
             WidenSigned(parts.defaultText, result);
             return result;
         }
-        m_Dictionary->Lookup(bytes.Get(), scratch, text);
+        UnitsView unescaped;
+        m_Dictionary->Lookup(bytes.Get(), scratch, unescaped);
+        text = orvik_private::BytesOf(unescaped);
     }
-    text = UpToZero(text);
-    result.append(text.data(), text.size());
+    AppendUpToZero(text, result);
     return result;
 }
 
 KTErrorCodeEnum KTStringDictionary::WriteToFile(KTFile const &file, bool binary) {
-    if (m_Dictionary == nullptr || file.Exists()) {
+    if (m_Dictionary == nullptr) {
+        return kKTErrorFailed;
+    }
+    // The host may have deleted a file that was read before. Its name is free when nobody uses the file any more.
+    try {
+        m_Dictionary->LetFilesGo();
+    } catch (std::bad_alloc const &) { // NOLINT(bugprone-empty-catch): then its name is not free
+    }
+    if (file.Exists()) {
         return kKTErrorFailed;
     }
     bool isTaken = false;
