@@ -65,21 +65,6 @@ std::string_view DictionaryBlock::ValueBytes(std::uint32_t position, KTUnits &sc
     return BytesOf(scratch);
 }
 
-void DictionaryBlock::LetFileGo() {
-    if (m_File.bytes == nullptr || !m_File.bytes->HoldsFile()) {
-        return;
-    }
-    DictionaryBuffer const &held = *m_File.bytes;
-    auto const own = std::make_shared<OwnBuffer>(held.Size());
-    std::memcpy(own->Bytes(), held.Bytes(), held.Size());
-    auto const moved = [&](unsigned char const *place) {
-        return place == nullptr ? nullptr : own->Bytes() + (place - held.Bytes());
-    };
-    m_File.keys = moved(m_File.keys);
-    m_File.values = moved(m_File.values);
-    m_File.bytes = own;
-}
-
 void DictionaryBlock::Add(std::string_view key, UnitsView value) {
     std::size_t const valueBytes = value.size() * kUnit;
     if (m_AddedCount % kRecordsInPiece == 0 && m_Added.size() == m_AddedCount / kRecordsInPiece) {

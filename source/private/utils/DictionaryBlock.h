@@ -78,10 +78,6 @@ class DictionaryBlock {
     /// stored form is another one. REQUIRES: alive and not replaced.
     std::string_view ValueBytes(std::uint32_t position, KTUnits &scratch) const;
 
-    /// Copies what lies in a file that is in use, so that it is no longer. Throws std::bad_alloc; nothing has changed
-    /// then.
-    void LetFileGo();
-
     /// Appends an entry. REQUIRES: both sizes fit in 32 bits, the text's bytes below the marks.
     void Add(std::string_view key, UnitsView value);
 

@@ -82,9 +82,6 @@ class DictionaryBuffer {
     unsigned char *Bytes() const noexcept { return m_Bytes; }
     std::size_t Size() const noexcept { return m_Size; }
 
-    /// Whether the file is in use as long as the buffer lives.
-    virtual bool HoldsFile() const noexcept = 0;
-
   protected:
     void SetBytes(unsigned char *bytes, std::size_t size) noexcept {
         m_Bytes = bytes;
@@ -106,8 +103,6 @@ class OwnBuffer final : public DictionaryBuffer {
 
     /// Leaves the first bytes only. REQUIRES: size <= Size().
     void Shorten(std::size_t size) noexcept { SetBytes(m_Own.get(), size); }
-
-    bool HoldsFile() const noexcept override { return false; }
 
   private:
     std::unique_ptr<unsigned char[]> m_Own;

@@ -44,7 +44,7 @@ void DictionaryBinaryReader::Report(DictionaryProblemKind kind, std::uint64_t of
 }
 
 void DictionaryBinaryReader::Read(BufferedSource &source) {
-    // The entries of version 1 point to their bytes one by one and could not leave a mapped file again.
+    // Files of version 1 are small and old; they are read, so that only one kind of entry depends on a mapped file.
     std::string_view const head = source.Peek(kDictionaryMagic.size() + 1);
     bool const isVersion2 = head.size() > kDictionaryMagic.size() && head.back() == 2;
     std::shared_ptr<DictionaryBuffer> const file = source.TakeRest(isVersion2);

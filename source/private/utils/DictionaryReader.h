@@ -138,9 +138,6 @@ class DictionaryReader {
     /// what was read before the trouble stays. Throws std::bad_alloc.
     void Read(ByteSource &source, DictionaryObserver *observer = nullptr);
 
-    /// Copies what lies in files that are in use, so that they can be deleted and written again. Throws std::bad_alloc.
-    void LetFilesGo() { m_Array->LetFilesGo(); }
-
     /// Writes the entries of the FastArray and returns the number of bytes written. What the sink throws, or an entry
     /// that the form cannot hold, ends the writing: "Serialize2" and ": Caught exception" go to the standard error,
     /// `isComplete` (if not null) becomes false, and the result counts what was written until then.

@@ -60,12 +60,6 @@ UnitsView FastArray::Value(std::uint32_t index, KTUnits &scratch) const {
     return UnitsOf(ValueBytes(index, scratch), scratch);
 }
 
-void FastArray::LetFilesGo() {
-    for (auto const &block : m_Blocks) {
-        block->LetFileGo();
-    }
-}
-
 std::uint32_t FastArray::FindTagged(std::uint32_t tag, std::string_view key) const noexcept {
     return m_Index.Find(tag, [&](std::uint32_t entry) { return EqualBytes(Key(entry), key); });
 }
@@ -154,7 +148,8 @@ void FastArray::LinkEntry(std::uint32_t tag, std::uint32_t index, std::string_vi
     if (key.empty()) {
         return;
     }
-    std::uint32_t const before = m_Index.Link(tag, index, [&](std::uint32_t entry) { return EqualBytes(Key(entry), key); });
+    std::uint32_t const before =
+        m_Index.Link(tag, index, [&](std::uint32_t entry) { return EqualBytes(Key(entry), key); });
     if (before == KeyIndex::kNone) {
         return;
     }

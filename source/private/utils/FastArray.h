@@ -72,9 +72,6 @@ class FastArray final : public RefCountObj {
     /// The same as the bytes of its units, which may begin at an odd address: nothing is copied for that.
     std::string_view ValueBytes(std::uint32_t index, KTUnits &scratch) const;
 
-    /// Copies what lies in files that are in use, so that none is. Throws std::bad_alloc; the rest is in use then.
-    void LetFilesGo();
-
     /// The key of an entry; empty when it has none. REQUIRES: index < EntryTotal().
     std::string_view Key(std::uint32_t index) const noexcept;
 

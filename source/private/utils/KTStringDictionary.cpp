@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <array>
+#include <cstdint>
 #include <cstring>
 #include <new>
 
@@ -74,19 +75,11 @@ void WidenSigned(std::string_view bytes, KTString &target) {
     }
 }
 
-// Appends units, which may begin at an odd address, up to the first zero among them.
-void AppendUpToZero(std::string_view bytes, KTString &target) {
-    constexpr std::size_t kUnit = sizeof(unsigned short);
+// Units before the first zero.
+std::size_t CountToZero(unsigned short const *units, std::size_t count) noexcept {
     constexpr std::size_t kAtOnce = 16;
-    std::size_t const count = bytes.size() / kUnit;
-    if (count == 0) {
-        return;
-    }
-    std::size_t at = target.size();
-    target.append(count, 0);
-    unsigned short const *const units = &target[0];
-    std::memcpy(&target[at], bytes.data(), count * kUnit);
-    for (; at + kAtOnce <= target.size(); at += kAtOnce) {
+    std::size_t at = 0;
+    for (; at + kAtOnce <= count; at += kAtOnce) {
         bool hasZero = false;
         for (std::size_t i = 0; i < kAtOnce; ++i) {
             hasZero |= units[at + i] == 0;
@@ -95,11 +88,26 @@ void AppendUpToZero(std::string_view bytes, KTString &target) {
             break;
         }
     }
-    while (at < target.size() && units[at] != 0) {
+    while (at < count && units[at] != 0) {
         ++at;
     }
-    if (at < target.size()) {
-        target.erase(at);
+    return at;
+}
+
+// Puts units up to the first zero among them into an empty text. At an odd address they are no units yet: they are
+// copied first.
+void PutUpToZero(std::string_view bytes, KTString &target) {
+    std::size_t const count = bytes.size() / sizeof(unsigned short);
+    if (reinterpret_cast<std::uintptr_t>(bytes.data()) % sizeof(unsigned short) == 0) {
+        auto const *const units = reinterpret_cast<unsigned short const *>(bytes.data());
+        target.append(units, CountToZero(units, count));
+        return;
+    }
+    target.append(count, 0);
+    std::memcpy(&target[0], bytes.data(), count * sizeof(unsigned short));
+    std::size_t const end = CountToZero(target.c_str(), count);
+    if (end < count) {
+        target.erase(end);
     }
 }
 
@@ -169,20 +177,12 @@ KTString KTStringDictionary::GetKeyValue(KTString const &key) {
         m_Dictionary->Lookup(bytes.Get(), scratch, unescaped);
         text = orvik_private::BytesOf(unescaped);
     }
-    AppendUpToZero(text, result);
+    PutUpToZero(text, result);
     return result;
 }
 
 KTErrorCodeEnum KTStringDictionary::WriteToFile(KTFile const &file, bool binary) {
-    if (m_Dictionary == nullptr) {
-        return kKTErrorFailed;
-    }
-    // The host may have deleted a file that was read before. Its name is free when nobody uses the file any more.
-    try {
-        m_Dictionary->LetFilesGo();
-    } catch (std::bad_alloc const &) { // NOLINT(bugprone-empty-catch): then its name is not free
-    }
-    if (file.Exists()) {
+    if (m_Dictionary == nullptr || file.Exists()) {
         return kKTErrorFailed;
     }
     bool isTaken = false;

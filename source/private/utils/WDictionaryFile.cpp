@@ -45,8 +45,6 @@ class MappedFile final : public DictionaryBuffer {
         SetBytes(static_cast<unsigned char *>(m_View.get()), size);
     }
 
-    bool HoldsFile() const noexcept override { return true; }
-
   private:
     WOHandle m_File;
     std::unique_ptr<void, UnmapView> m_View; // goes first
