@@ -67,6 +67,8 @@ int Run(Console const &console, Options const &options) {
     std::vector<TextResult *> const languages = ChooseLanguages(results);
     LookTextsUp(languages);
     log.Step("languages loaded: " + std::to_string(languages.size()));
+    CourseReading const reading = ReadCourse(folder.files, log);
+    std::vector<TextResult> const &results = reading.results;
 
     ReportLimits limits;
     if (options.all) {
@@ -94,6 +96,7 @@ int Run(Console const &console, Options const &options) {
     console.Print(ReportMail());
     console.Print(ReportSystem(path));
     console.Print(ReportChecks(results));
+    console.Print(ReportWork(reading));
 
     bool const anyRead = std::any_of(results.begin(), results.end(), [](auto const &result) { return result.isRead; });
     bool const onlyOthers = results.empty() && !folder.files.empty();
