@@ -1,7 +1,8 @@
 // WOPause.cpp: short sleeps by the system's timers.
 //
 // Sleeping with a time limit ends with the system's clock interrupt, every 15.6 milliseconds on most machines. Timers of
-// high resolution do not wait for it; systems before Windows 10 of 2018 do not have them.
+// high resolution do not wait for it. Windows has them since 2018; elsewhere asking for one gives nothing, or an ordinary
+// timer, which would only be a more expensive way to sleep.
 
 #include "OPause.h"
 
@@ -21,12 +22,21 @@ namespace {
 
 constexpr KTUInt64 kMicrosecondsPerMillisecond = 1000;
 constexpr LONGLONG kCountsPerMicrosecond = 10;
+constexpr DWORD kNoSuchFlag = 0x40000000;
+
+WOHandle MakeTimer(DWORD flags) {
+    return WOHandle(CreateWaitableTimerExW(nullptr, nullptr, flags, SYNCHRONIZE | TIMER_MODIFY_STATE));
+}
+
+// A system that takes any flag does not know this one either.
+bool ChecksFlags() { return !MakeTimer(kNoSuchFlag).IsValid(); }
 
 } // namespace
 
 OPause::OPause() : m_Timer(std::make_unique<Timer>()) {
-    m_Timer->handle = WOHandle(CreateWaitableTimerExW(nullptr, nullptr, CREATE_WAITABLE_TIMER_HIGH_RESOLUTION,
-                                                      SYNCHRONIZE | TIMER_MODIFY_STATE));
+    if (ChecksFlags()) {
+        m_Timer->handle = MakeTimer(CREATE_WAITABLE_TIMER_HIGH_RESOLUTION);
+    }
 }
 
 OPause::~OPause() = default;
