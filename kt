@@ -31,7 +31,8 @@ usage: ./kt COMMAND
   bench [FILTER [ARGS]] the benchmarks beside their peers; the page is build/bench/index.html; the arguments go to
                         Google Benchmark
   sanitize              the portable half natively under ASan and UBSan, then under TSan
-  soak [SECONDS]        message threads under load for that long (300), looking for losses, standstill and leaks
+  soak [SECONDS]        message threads and timers under load for that long (300), looking for losses, standstill
+                        and leaks
   fuzz SECONDS          every fuzz target for that long
   lint                  clang-format and clang-tidy over all sources
   install PREFIX        DLL, headers, CMake package, tools and licence notes

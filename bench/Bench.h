@@ -79,5 +79,6 @@ void AddThreadBenchmarks();
 void AddServiceBenchmarks();
 void AddReaderBenchmarks();
 void AddPictureBenchmarks();
+void AddTimerBenchmarks();
 
 } // namespace bench

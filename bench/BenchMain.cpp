@@ -60,6 +60,7 @@ int main(int argc, char **argv) {
     bench::AddServiceBenchmarks();
     bench::AddReaderBenchmarks();
     bench::AddPictureBenchmarks();
+    bench::AddTimerBenchmarks();
 
     bench::Report report;
     if (benchmark::RunSpecifiedBenchmarks(&report) == 0) {

@@ -144,7 +144,12 @@ std::string GrowthTable(Group const &group) {
     std::string html = "<table><tr><th>case</th><th>cost</th></tr>\n";
     for (Row const &row : group.rows) {
         auto const growth = group.Growth(row);
-        html += "<tr><td>" + HtmlOf(row.name) + "</td><td>" + (growth ? RatioText(*growth) : "") + "</td></tr>\n";
+        html += "<tr><td>" + HtmlOf(row.name) + "</td><td>" + (growth ? RatioText(*growth) : "");
+        for (std::string const &peer : group.Peers()) {
+            auto const peers = group.Growth(row, peer);
+            html += peers ? " (" + HtmlOf(peer) + ' ' + RatioText(*peers) + ')' : "";
+        }
+        html += "</td></tr>\n";
     }
     return html + "</table>\n";
 }

@@ -6,6 +6,7 @@
 #include "KTClosedCaptionFileReader.h"
 #include "KTSimpleIniFileReader.h"
 
+#define SI_IMPLEMENTATION // Debian's header has the templates' bodies for those who ask
 #include <SimpleIni.h>
 #include <windows.h>
 
@@ -213,7 +214,7 @@ void ReadCaptions(benchmark::State &state, unsigned int mode) {
     }
 }
 
-void SplitLines(benchmark::State &state, char const *separators, boost::token_compress_mode_type mode) {
+void SplitLines(benchmark::State &state, char const *separators, boost::algorithm::token_compress_mode_type mode) {
     for (auto _ : state) {
         std::vector<std::vector<std::string>> rows;
         std::ifstream file(CaptionFile().Path(), std::ios::binary);

@@ -79,7 +79,12 @@ std::string GrowthTable(Group const &group) {
     std::string text;
     for (Row const &row : group.rows) {
         auto const growth = group.Growth(row);
-        text += "  " + Padded(row.name, 32) + (growth ? RatioText(*growth) : "") + '\n';
+        text += "  " + Padded(row.name, 32) + Padded(growth ? RatioText(*growth) : "", 10);
+        for (std::string const &peer : group.Peers()) {
+            auto const peers = group.Growth(row, peer);
+            text += peers ? "  " + peer + ' ' + RatioText(*peers) : "";
+        }
+        text += '\n';
     }
     return text;
 }
@@ -139,15 +144,15 @@ bool Group::IsMet(std::string const &peer, double speed) const {
     return target == targets.end() || speed >= target->second;
 }
 
-std::optional<double> Group::Growth(Row const &row) const {
+std::optional<double> Group::Growth(Row const &row, std::string const &contender) const {
     auto const first =
         std::find_if(rows.begin(), rows.end(), [&](Row const &candidate) { return candidate.kase == row.kase; });
-    Contender const *const smallest = first->Find(kOurs);
-    Contender const *const ours = row.Find(kOurs);
-    if (smallest == nullptr || ours == nullptr) {
+    Contender const *const smallest = first->Find(contender);
+    Contender const *const present = row.Find(contender);
+    if (smallest == nullptr || present == nullptr) {
         return std::nullopt;
     }
-    return ours->Median() / smallest->Median();
+    return present->Median() / smallest->Median();
 }
 
 Report::Report() : m_Groups(DescribedGroups()) {}

@@ -6,6 +6,8 @@
 
 #pragma once
 
+#include "Bench.h"
+
 #include <benchmark/benchmark.h>
 
 #include <map>
@@ -48,8 +50,8 @@ struct Group {
     /// Whether the speed meets the peer's target; true where there is no target.
     bool IsMet(std::string const &peer, double speed) const;
 
-    /// The row's cost as a multiple of that of its case's first row, for growth groups.
-    std::optional<double> Growth(Row const &row) const;
+    /// The row's cost as a multiple of that of its case's first row, for growth groups: the library's or a peer's.
+    std::optional<double> Growth(Row const &row, std::string const &contender = kOurs) const;
 };
 
 /// Collects the repetitions of every benchmark.

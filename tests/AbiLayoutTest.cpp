@@ -16,6 +16,19 @@
 //          8  the owned implementation object      8  u64  param1 to 4       8  u64   two
 //                                                                           24  void*
 //
+//     KTTimerService, 5856 bytes                          KTFixedSizedSlots<CTimerInfo, 50>, 2864 bytes
+//          0  KTWorkerThread                                      0  virtual table
+//         16  KTRecursiveMutex  of threads' timers                8  CTimerInfo  scratch
+//         32  KTRecursiveMutex  of UI timers                     48  50 of       CTimerInfo, i32 previous, i32 next,
+//         48  bool              running                                          i32 next free, 4 bytes nothing
+//         56  slots             of thread timers               2848  i32         capacity
+//       2920  slots             of single bursts               2852  i32         first free
+//       5784  std::map          of UI timers                   2856  i32         first used
+//       5832  i64               current UI timer
+//       5840  void*             window                     CTimerInfo, 40 bytes
+//       5848  its dispatch                                        0  KTThread*, i64 and i32 interval, i64 and i32
+//                                                                    countdown, i32 message
+//
 //     KTTime, 16 bytes             KTDuration, 24 bytes
 //          0  virtual table             0  virtual table
 //          8  u64  count                8  KTReal  amount
@@ -205,6 +218,54 @@ TEST(AbiLayoutTest, TimesAndDurationsHaveTheirFieldsInOrder) {
     EXPECT_EQ(24U, sizeof(KTDuration));
     EXPECT_EQ(2.5, ValueAt<double>(&duration, 8));
     EXPECT_EQ(0x01020304, ValueAt<int>(&duration, 16));
+}
+
+TEST(AbiLayoutTest, TheTimerServiceHasItsFieldsInOrder) {
+    EXPECT_EQ(40U, sizeof(KTTimerService::CTimerInfo));
+    KTTimerService::CTimerInfo const info{nullptr, 1, 2, 3, 4, static_cast<KT_THREAD_MESSAGE>(5)};
+    EXPECT_EQ(nullptr, PointerAt(&info, 0));
+    EXPECT_EQ(1, ValueAt<KTInt64>(&info, 8));
+    EXPECT_EQ(2, ValueAt<KTInt32>(&info, 16));
+    EXPECT_EQ(3, ValueAt<KTInt64>(&info, 24));
+    EXPECT_EQ(4, ValueAt<KTInt32>(&info, 32));
+    EXPECT_EQ(5, ValueAt<KTInt32>(&info, 36));
+
+    constexpr std::size_t kSlots = 48; // behind table and scratch element
+    constexpr std::size_t kSlot = 56;  // an element and three links
+    constexpr std::size_t kLists = kSlots + 50 * kSlot;
+    EXPECT_EQ(kLists + 16, sizeof(KTTimerService::CTimerSlots));
+
+    KTCreateTimerService();
+    KTTimerService const *const service = KTTimerService::GetInstance();
+    ASSERT_NE(nullptr, service);
+    EXPECT_EQ(5856U, sizeof(KTTimerService));
+    EXPECT_EQ(ExportedTable<KTTimerService>(), PointerAt(service, 0));
+    EXPECT_EQ(ExportedTable<KTRecursiveMutex>(), PointerAt(service, 16));
+    EXPECT_EQ(ExportedTable<KTRecursiveMutex>(), PointerAt(service, 32));
+    EXPECT_TRUE(ValueAt<bool>(service, 48));
+    KTInt64 id = 0;
+    KTCreateTimer(nullptr, 1'000'000'001, &id, static_cast<KT_THREAD_MESSAGE>(0x01020304));
+    KTCreateSingleBurstTimer(nullptr, 2'000'000'002, &id, static_cast<KT_THREAD_MESSAGE>(0x05060708));
+    KTInt64 seconds = 1'000'000;
+    KTInt32 message = 0x01020304;
+    for (std::size_t const slots : {56U, 56U + 2864U}) {
+        std::size_t const first = slots + kSlots;
+        EXPECT_EQ(nullptr, PointerAt(service, first));
+        EXPECT_EQ(seconds, ValueAt<KTInt64>(service, first + 8));
+        EXPECT_EQ(message, ValueAt<KTInt32>(service, first + 36));
+        for (std::size_t const link : {40U, 44U, 48U}) {
+            EXPECT_EQ(-1, ValueAt<KTInt32>(service, first + link));
+        }
+        EXPECT_EQ(2, ValueAt<KTInt32>(service, first + kSlot + 48)); // the free list goes on
+        EXPECT_EQ(50, ValueAt<KTInt32>(service, slots + kLists));
+        EXPECT_EQ(1, ValueAt<KTInt32>(service, slots + kLists + 4)); // first free
+        EXPECT_EQ(0, ValueAt<KTInt32>(service, slots + kLists + 8)); // first used
+        seconds *= 2;
+        message += 0x04040404;
+    }
+    EXPECT_EQ(0, ValueAt<KTInt64>(service, 5832)); // behind the map: no UI timer's function runs
+    EXPECT_EQ(FindWindowW(L"InvisibleTimerServiceClass", nullptr), PointerAt(service, 5840));
+    KTDestroyTimerService();
 }
 
 TEST(AbiLayoutTest, ColoursHaveTheirFieldsInOrder) {

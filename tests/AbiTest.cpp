@@ -220,6 +220,7 @@ VTableRow const kTables[] = {
                         "long long, unsigned long long, unsigned long long)",
                         "pure"}),
     VTableOf<KTWorkerThread>({"pure ~", "pure"}),
+    VTableOf<KTTimerService>({"~", "KTTimerService::run()"}),
     VTableOf<KTStateMachine>({"KTStateMachine::Get() const", "KTStateMachine::Validate(int) const", "~"}),
 };
 

@@ -451,6 +451,31 @@ TEST_F(Demo, ACourseThatCannotBeCopiedIsStillShown) {
     EXPECT_TRUE(outcome.Has("not copied to the session folder: too large, or a file cannot be read\n"));
 }
 
+TEST_F(Demo, WorkIsSavedAndProgressShown) {
+    Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
+    EXPECT_TRUE(outcome.Has("\nWork\n  texts finished by two message threads: 6 of 6\n"
+                            "  texts in the autosave file: 6 of 6, written "))
+        << outcome.out;
+    EXPECT_FALSE(outcome.Has("written 0 times"));
+    EXPECT_TRUE(outcome.Has("\n  progress shown ")) << outcome.out;
+    std::string const log = ReadAll(m_Temp / "ktap_log.txt");
+    EXPECT_NE(log.find(": progress: 6 of 6\n"), std::string::npos) << log;
+    // Work, then the readers' end, then what the program does next.
+    EXPECT_LT(log.find(": progress: 6 of 6\n"), log.find(": worker 1: ended"));
+    EXPECT_LT(log.find(": worker 2: ended"), log.find(": copied to the session folder"));
+}
+
+TEST_F(Demo, WorkOnManyTextsIsSavedWhole) {
+    for (int i = 0; i < 1100; ++i) { // more than a message queue holds
+        Write("text" + std::to_string(i) + ".txt", "one two\n");
+    }
+    Outcome const outcome = CheckEmptyError(RunOnFolder());
+    EXPECT_TRUE(outcome.Has("  texts finished by two message threads: 1100 of 1100\n"
+                            "  texts in the autosave file: 1100 of 1100, written "));
+    std::string const log = ReadAll(m_Temp / "ktap_log.txt");
+    EXPECT_NE(log.find(": progress: 1100 of 1100\n"), std::string::npos);
+}
+
 TEST_F(Demo, LogIsWhereItSaysAndHasAsManyLines) {
     Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
     std::string const log = ReadAll(m_Temp / "ktap_log.txt");

@@ -2,6 +2,8 @@
 
 #include "DictionaryFiles.h"
 
+#include "SipHash.h"
+
 #include <gtest/gtest.h>
 
 using namespace dictionary_files;
@@ -17,6 +19,26 @@ std::uint32_t PlainHash(std::string_view key, std::uint32_t modulus) {
         hash = (hash * 32 + static_cast<unsigned char>(key[at])) % modulus;
     }
     return hash;
+}
+
+// The vector of the paper's appendix A, and vectors of SipHash-1-3 under a secret of zeros, which other implementations
+// give for these bytes.
+TEST(SipHashTest, PublishedVectors) {
+    std::string bytes;
+    for (char byte = 0; byte < 15; ++byte) {
+        bytes.push_back(byte);
+    }
+    EXPECT_EQ(0xA129CA6149BE45E5U, (SipHash<2, 4>({0x0706050403020100, 0x0F0E0D0C0B0A0908}, bytes)));
+    struct Vector {
+        char const *bytes;
+        std::uint64_t hash;
+    };
+    for (Vector const &vector :
+         {Vector{"a", 0x407448D2B89B1813}, Vector{"/A/Bc", 0xFB15AF11E58A4D65}, Vector{"1234567", 0xA33D651594FDAE81},
+          Vector{"12345678", 0x3489982430560A87}, Vector{"123456789", 0x0FBC0F0007965FCF},
+          Vector{"/Area12/Dialog34/Control567", 0x04CF076066C44935}, Vector{"0123456789abcdef", 0x1D42B30F7E060C24}}) {
+        EXPECT_EQ(vector.hash, (SipHash<1, 3>({}, vector.bytes))) << vector.bytes;
+    }
 }
 
 TEST(DictionaryKeyTest, HashesSampledBytes) {

@@ -148,6 +148,18 @@ constexpr Corruption kCorruptions[] = {
     {"a list near 2^32", [](SmallFile &file) { file.counts = {0xFFFFFFFF, 1}; }, "/A=B /Bc=H<00E9>"},
     {"a bucket beyond 1020", [](SmallFile &file) { file.numbers = {310, 1021}; }, "/A=B /Bc=H<00E9>"},
     {"another bucket", [](SmallFile &file) { file.numbers = {310, 547}; }, "/A=B /Bc=H<00E9>"},
+    {"a bucket of 65535 with an entry that is not there",
+     [](SmallFile &file) {
+         file.numbers = {310, 0xFFFF};
+         file.indices = {1, 0x10000000};
+     },
+     "/A=B /Bc=H<00E9>"},
+    {"a bucket of 65534 with a key of no bytes",
+     [](SmallFile &file) {
+         file.keyLengths = {0, 3};
+         file.numbers = {310, 0xFFFE};
+     },
+     "=B /Bc=H<00E9>"},
     {"an index beyond the entries", [](SmallFile &file) { file.indices = {1, 2}; }, "/A=B /Bc=H<00E9>"},
     {"an index near 2^32", [](SmallFile &file) { file.indices = {1, 0xFFFFFFFF}; }, "/A=B /Bc=H<00E9>"},
     {"an index twice", [](SmallFile &file) { file.indices = {1, 1}; }, "/A=B /Bc=H<00E9>"},

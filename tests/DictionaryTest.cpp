@@ -1,5 +1,6 @@
 // DictionaryTest.cpp: the process-wide dictionary as hosts use it.
 
+#include "DictionaryFiles.h"
 #include "IKTStringDictionary.h"
 #include "KTFileUtil.h"
 #include "KTPublicUtils.h"
@@ -8,6 +9,7 @@
 
 #include <gtest/gtest.h>
 
+#include <bit>
 #include <filesystem>
 #include <fstream>
 #include <iterator>
@@ -177,6 +179,85 @@ TEST_F(DictionaryTest, AFileIsFreeAgainOnceItIsRead) {
     Texts().ReadFromFile(file);
     EXPECT_TRUE(file.Delete());
     EXPECT_EQ(KTString("text"), Texts().GetKeyValue(KTString("/A")));
+}
+
+// Large files stay where they are and are looked into there.
+class LargeDictionaryTest : public DictionaryTest {
+  protected:
+    static constexpr int kEntries = 20'000;
+
+    static std::string Key(int i) { return "/Large/Key" + std::to_string(i); }
+    static std::string Text(int i) { return "A text of some length with the number " + std::to_string(i); }
+
+    // With a key more, texts begin at an odd place instead of an even one, or the other way round.
+    static std::string LargeFile(bool hasOneMore, std::endian order) {
+        orvik_private::DictionaryReader dictionary;
+        for (int i = 0; i < kEntries; ++i) {
+            std::string const text = Text(i);
+            dictionary.Add(Key(i), KTUnits(text.begin(), text.end()));
+        }
+        if (hasOneMore) {
+            dictionary.Add("x", {});
+        }
+        return dictionary_files::WriteBytes(dictionary, {true, orvik_private::kEncodingNone, order});
+    }
+    static void ExpectAll() {
+        for (int i = 0; i < kEntries; ++i) {
+            ASSERT_EQ(KTString(Text(i).c_str()), Texts().GetKeyValue(KTString(Key(i).c_str())));
+        }
+        EXPECT_EQ(KTString("none"), Texts().GetKeyValue(KTString("/Large/Key=none")));
+    }
+};
+
+TEST_F(LargeDictionaryTest, IsFoundWhereverItsTextsBegin) {
+    for (bool const hasOneMore : {false, true}) {
+        for (std::endian const order : {std::endian::little, std::endian::big}) {
+            Forget();
+            std::string const bytes = LargeFile(hasOneMore, order);
+            EXPECT_LT(std::size_t{1} << 20, bytes.size());
+            EXPECT_EQ(kKTErrorNone, Texts().ReadFromFile(File(u8"large", bytes)));
+            ExpectAll();
+            EXPECT_EQ(bytes, Content(u8"large")) << "its units were swapped in memory alone";
+        }
+    }
+}
+
+TEST_F(LargeDictionaryTest, OutlivesItsFile) {
+    KTFile const file = File(u8"large", LargeFile(false, std::endian::little));
+    Texts().ReadFromFile(file);
+    Texts().AddString("/Added", "later");
+    EXPECT_TRUE(file.Delete());
+    ExpectAll();
+    EXPECT_EQ(kKTErrorNone, Texts().WriteToFile(File(u8"copy"), true)) << "under another name at any time";
+    ExpectAll();
+    Forget();
+    EXPECT_FALSE(file.Exists());
+    Texts().ReadFromFile(File(u8"copy"));
+    ExpectAll();
+    EXPECT_EQ(KTString("later"), Texts().GetKeyValue(KTString("/Added")));
+}
+
+#ifdef _WIN32
+TEST_F(LargeDictionaryTest, KeepsItsFilesNameUntilItGoes) {
+    KTFile const file = File(u8"large", LargeFile(false, std::endian::little));
+    Texts().ReadFromFile(file);
+    EXPECT_TRUE(file.Delete());
+    EXPECT_EQ(kKTErrorFailed, Texts().WriteToFile(file, true)) << "never a silent loss";
+    ExpectAll();
+}
+#endif
+
+TEST_F(LargeDictionaryTest, StaysAsItWasRead) {
+    KTFile const file = File(u8"large", LargeFile(false, std::endian::little));
+    Texts().ReadFromFile(file);
+    EXPECT_EQ(kKTErrorFailed, Texts().WriteToFile(file, true)) << "it is there";
+    Forget();
+    Texts().ReadFromFile(file);
+    Texts().ReadFromFile(file);
+    ExpectAll();
+    Forget();
+    EXPECT_TRUE(file.Delete());
+    EXPECT_FALSE(file.Exists());
 }
 
 TEST_F(DictionaryTest, WhatCannotBeWrittenLeavesNoFile) {

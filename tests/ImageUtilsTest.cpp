@@ -199,7 +199,7 @@ TEST(GraphicsUtils, SubImageGoesOnInTheNextRowBeyondTheRightEdge) {
 }
 
 TEST(GraphicsUtils, SubImageRefusesWhatIsNoPartOfAPicture) {
-    Bytes const image(9 * 4, 1);
+    Bytes const image(std::size_t{9} * 4, 1);
     auto const refused = [&](unsigned char const *from, int width, int height, int x, int y, int subWidth,
                              int subHeight, KTPixelFormatEnum format = kKTPixelFormatBGRA) {
         ExpectInternalError(
@@ -352,7 +352,7 @@ TEST(EdgeMaskTexture, IsAFadedWhiteTexture) {
     KTTextureCoord2D const region(0.25, 0.25, 0.75, 0.75);
     KTTexture2D texture(9, 1, 1, 1, 1);
     KTGraphicsUtils::GetEdgeMaskTexture(renderer, 20, 64, region, texture);
-    Bytes expected(20 * 64 * 4, 255);
+    Bytes expected(std::size_t{20} * 64 * 4, 255);
     PlainMask(20, 64, 4, region, expected);
     ASSERT_EQ(renderer.manager.uploads.size(), 1U);
     Upload const &upload = renderer.manager.uploads[0];

@@ -79,6 +79,7 @@ std::vector<int> Widths(RecordingRenderer const &renderer) {
 
 std::vector<float> Bottoms(KTLargeTexturedQuad3D const &large) {
     std::vector<float> bottoms;
+    bottoms.reserve(large.quads.size());
     for (KTTexturedQuad3D const &tile : large.quads) {
         bottoms.push_back(tile.quad.bottomLeft.y);
     }
@@ -367,9 +368,9 @@ TEST(LargeQuadLoad, CutsFromTheImageItselfAwayFromItsEdges) {
     KTLoadTextureParams params = ParamsOf(kKTPixelFormatAlpha8);
     picture.LoadInto(large, renderer, {0.125, 0.125, 0.5, 0.75}, params);
     ASSERT_EQ(renderer.manager.uploads.size(), 6U);
-    EXPECT_EQ(renderer.manager.uploads[0].pixels, picture.bytes.data() + 3 * 16 + 1);
-    EXPECT_EQ(renderer.manager.uploads[2].pixels, picture.bytes.data() + 11 * 16 + 1);
-    EXPECT_EQ(renderer.manager.uploads[3].pixels, picture.bytes.data() + 3 * 16 + 5);
+    EXPECT_EQ(renderer.manager.uploads[0].pixels, &picture.bytes[std::size_t{3} * 16 + 1]);
+    EXPECT_EQ(renderer.manager.uploads[2].pixels, &picture.bytes[std::size_t{11} * 16 + 1]);
+    EXPECT_EQ(renderer.manager.uploads[3].pixels, &picture.bytes[std::size_t{3} * 16 + 5]);
     EXPECT_EQ(renderer.manager.uploads[3].width, 2 + 2);
     EXPECT_EQ(params.rowLength, 16);
 }
@@ -392,12 +393,13 @@ TEST(LargeQuadLoad, CopiesTheImageIntoAFrameWhenAnEdgeIsTouched) {
 TEST(LargeQuadLoad, RoundsTheRegionToPixels) {
     // 2.5, 5.5 and 6.5 pixels become 3, 6 and 7; 2.4, 5.4 and 1.4 become 2, 5 and 1.
     Picture const picture(10, 10);
-    for (auto const &[region, x, y, width, height] : {std::tuple{KTTextureCoord2D(0.25, 0.16, 0.8, 0.81), 3, 2, 6, 7},
-                                                      {KTTextureCoord2D(0.24, 0.16, 0.78, 0.86), 2, 1, 5, 7}}) {
+    for (auto const &[region, x, y, width, height] :
+         {std::tuple{KTTextureCoord2D(0.25, 0.16, 0.8, 0.81), std::size_t{3}, std::size_t{2}, 6, 7},
+          {KTTextureCoord2D(0.24, 0.16, 0.78, 0.86), 2, 1, 5, 7}}) {
         RecordingRenderer const renderer(4);
         KTLargeTexturedQuad3D large;
         picture.LoadInto(large, renderer, region);
-        EXPECT_EQ(renderer.manager.uploads.at(0).pixels, picture.bytes.data() + (y - 1) * 10 + (x - 1));
+        EXPECT_EQ(renderer.manager.uploads.at(0).pixels, &picture.bytes[(y - 1) * 10 + (x - 1)]);
         EXPECT_EQ(renderer.manager.uploads.back().width, width - 4 + 2);
         EXPECT_EQ(renderer.manager.uploads.back().height, height - 4 + 2);
     }
@@ -415,6 +417,7 @@ TEST(LargeQuadLoad, MovesARegionThatRoundingCarriesBeyondTheImage) {
     picture.LoadInto(large, renderer, {0.5, 0, 1, 0.5});
     ASSERT_EQ(renderer.manager.uploads.size(), 4U);
     std::vector<int> centers;
+    centers.reserve(renderer.manager.uploads.size());
     for (Upload const &upload : renderer.manager.uploads) {
         centers.push_back(upload.bytes.at(4));
     }

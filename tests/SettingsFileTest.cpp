@@ -10,7 +10,6 @@
 
 #include <climits>
 #include <cmath>
-#include <cstring>
 #include <limits>
 #include <locale>
 #include <memory>
@@ -47,6 +46,7 @@ class SettingsFile : public StreamFixture {
         LogLines log;
         auto const settings = Load(content);
         std::vector<std::string> expected;
+        expected.reserve(model.assertions.size());
         for (int const line : model.assertions) {
             expected.push_back(Assertion(line));
         }
@@ -317,9 +317,10 @@ template <typename Number> Number ByStream(std::string const &text, Number value
     return value;
 }
 
-// Bit by bit, as a zero has a sign.
+// A zero has a sign.
 template <typename Number> void ExpectSame(Number expected, Number found, std::string const &text) {
-    EXPECT_EQ(0, std::memcmp(&expected, &found, sizeof expected)) << '"' << text << "\" " << expected << ' ' << found;
+    EXPECT_EQ(expected, found) << '"' << text << '"';
+    EXPECT_EQ(std::signbit(static_cast<double>(expected)), std::signbit(static_cast<double>(found))) << text;
 }
 
 void ExpectNumbersByStream(KTSimpleIniFileReader &settings, KTString const &name, std::string const &text) {

@@ -284,7 +284,7 @@ TEST(TilePicture, IsShownWholeOnQuadsOfOtherSizes) {
 
 TEST(TilePicture, HasNoGapWhenScaledAndTurned) {
     // Opaque white over black: between the tiles nothing black may show, nor may a pixel be drawn twice.
-    std::vector<unsigned char> const white(200 * 100, 128);
+    std::vector<unsigned char> const white(std::size_t{200} * 100, 128);
     soft::Renderer const renderer({32, false, true, true});
     KTLargeTexturedQuad3D large;
     KTLoadTextureParams params(true, false, true, false, 0, 0, kKTPixelFormatAlpha8);

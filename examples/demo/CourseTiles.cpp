@@ -31,8 +31,8 @@ constexpr int kFramesBetweenPictures = 20;
 constexpr int kSamples = 2; // of a frame's pixel, in each direction
 
 struct Machine {
-    char const *name;
-    char const *file;
+    char const *name = nullptr;
+    char const *file = nullptr;
     Limits limits;
 };
 

@@ -1,13 +1,16 @@
-// ReadCourse.cpp: the message threads that read a course.
+// ReadCourse.cpp: the message threads that read a course, and the timers that save and show how far they are.
 
 #include "ReadCourse.h"
 
+#include "Autosave.h"
 #include "KTThread.h"
+#include "KTTimerService.h"
 #include "Table.h"
 #include "TextReader.h"
 #include "WDisk.h"
+#include "WPump.h"
 
-#include <algorithm>
+#include <atomic>
 #include <exception>
 #include <new>
 
@@ -60,17 +63,32 @@ void ReadText(TextResult &result, int worker, RunLog &log) {
 
 // The messages of a reader, besides the library's quit message.
 constexpr auto kBegin = static_cast<KT_THREAD_MESSAGE>(100);
-constexpr auto kReadFile = static_cast<KT_THREAD_MESSAGE>(101); // param1: the index of the result
-constexpr auto kAllPosted = static_cast<KT_THREAD_MESSAGE>(102);
+constexpr auto kReadNext = static_cast<KT_THREAD_MESSAGE>(101);
+constexpr auto kSave = static_cast<KT_THREAD_MESSAGE>(102);
+constexpr auto kAllRead = static_cast<KT_THREAD_MESSAGE>(103);
 
-// A message thread that reads the files it is told to. The end of the object ends the thread, in the order a host must
-// keep: quit message, join, and only then is what the thread uses destroyed.
+constexpr long kSaveInterval = 20;     // milliseconds
+constexpr long kProgressInterval = 20; // milliseconds
+
+// What the readers share.
+struct Work {
+    Work(std::vector<TextResult> &allResults, RunLog &runLog) : results(allResults), log(runLog) {}
+
+    std::vector<TextResult> &results; // each is written by the reader that took its index
+    RunLog &log;
+    std::atomic<std::size_t> next{0};
+    Autosave autosave;
+};
+
+// A message thread that reads one file after another. Between two files it handles what else was posted: it posts the
+// next step of its work to itself. The end of the object ends the thread, in the order a host must keep: quit message,
+// join, and only then is what the thread uses destroyed.
 class Reader : public KTThread {
   public:
-    Reader(int worker, std::vector<TextResult> &results, RunLog &log)
-        : m_Worker(worker), m_Results(results), m_Log(log) {
+    Reader(int worker, Work &work) : m_Worker(worker), m_Work(work) {
         start();
         postMessage(kBegin, 0, 0, 0, 0);
+        postMessage(kReadNext, 0, 0, 0, 0);
     }
     Reader(Reader const &) = delete;
     Reader &operator=(Reader const &) = delete;
@@ -79,31 +97,44 @@ class Reader : public KTThread {
         join();
     }
 
-    // Waits for room where too many files wait already.
-    void Read(std::size_t index) {
-        while (!postMessage(kReadFile, index, 0, 0, 0)) {
-            KTSleepForDuration(0, 1);
-        }
-    }
-
-    // Messages are handled in their order, so all files have been read when this one has been handled.
-    void WaitUntilAllAreRead() { syncPostMessage(kAllPosted, 0, 0, 0, 0); }
+    // Waits until this reader has found no more files to read, or has saved.
+    void WaitUntilAllIsRead() { syncPostMessage(kAllRead, 0, 0, 0, 0); }
+    void WaitUntilSaved() { syncPostMessage(kSave, 0, 0, 0, 0); }
 
     void processMessage(KTThreadMsg const &msg) override {
         if (msg.message == kBegin) {
-            m_Log.WorkerStarted(m_Worker);
-        } else if (msg.message == kReadFile) {
-            ReadOne(m_Results[msg.param1]);
+            m_Work.log.WorkerStarted(m_Worker);
+        } else if (msg.message == kReadNext) {
+            ReadNext();
+        } else if (msg.message == kSave) {
+            m_Work.autosave.Save();
+        } else if (msg.message == kAllRead) {
+            while (ReadNext()) {
+            }
         } else if (msg.message == KT_THREAD_MSG_QUIT) {
-            m_Log.WorkerEnded(m_Worker, m_Files);
+            m_Work.log.WorkerEnded(m_Worker, m_Files);
         }
     }
 
   private:
+    // Whether there was one.
+    bool ReadNext() {
+        std::size_t const index = m_Work.next++;
+        if (index >= m_Work.results.size()) {
+            return false;
+        }
+        TextResult &result = m_Work.results[index];
+        ReadOne(result);
+        m_Work.autosave.Add(Printable(result.file.name) + "\t" + std::to_string(result.facts.lines) + "\t" +
+                            std::to_string(result.facts.words));
+        postMessage(kReadNext, 0, 0, 0, 0);
+        return true;
+    }
+
     // What left this function would end the thread, and with it the program.
     void ReadOne(TextResult &result) {
         try {
-            ReadText(result, m_Worker, m_Log);
+            ReadText(result, m_Worker, m_Work.log);
             ++m_Files;
         } catch (std::bad_alloc const &) {
             result.notes.emplace_back("too large for the memory");
@@ -113,29 +144,85 @@ class Reader : public KTThread {
     }
 
     int m_Worker;
-    std::vector<TextResult> &m_Results; // each reader writes to the ones it was told to only
-    RunLog &m_Log;
+    Work &m_Work;
     int m_Files = 0;
 };
 
-} // namespace
+// The library's timer service, for a scope of the thread that pumps messages.
+class TimerService {
+  public:
+    TimerService() { KTCreateTimerService(); }
+    TimerService(TimerService const &) = delete;
+    TimerService &operator=(TimerService const &) = delete;
+    ~TimerService() { KTDestroyTimerService(); }
+};
 
-std::vector<TextResult> ReadCourse(std::vector<CourseFile> const &files, RunLog &log) {
-    std::vector<TextResult> results;
-    for (CourseFile const &file : files) {
-        if (file.kind == FileKind::Text) {
-            results.emplace_back().file = file;
+// Shows how far the readers are, and ends the pump when all is read and saved. Called by a UI timer.
+struct Progress {
+    explicit Progress(Work &readersWork) : work(readersWork) {}
+
+    Work &work;
+    std::size_t shown = 0; // how often
+    std::size_t lastLines = 0;
+
+    static void Show(KTInt64 id, void *progress) { static_cast<Progress *>(progress)->Show(id); }
+
+    void Show(KTInt64 id) {
+        std::size_t const lines = work.autosave.Lines();
+        if (shown == 0 || lines != lastLines) {
+            ++shown;
+            lastLines = lines;
+            try {
+                work.log.Step("progress: " + std::to_string(lines) + " of " + std::to_string(work.results.size()));
+            } catch (std::bad_alloc const &) {
+                lastLines = 0; // once more at the next tick: no exception may leave a timer's function
+            }
+        }
+        if (lines == work.results.size() && work.autosave.Tried() == lines) {
+            KTKillUITimer(id);
+            QuitPump();
         }
     }
-    // Two, as each may hold a large file; they read every other file each.
-    {
-        Reader first(1, results, log);
-        Reader second(2, results, log);
-        for (std::size_t index = 0; index < results.size(); ++index) {
-            (index % 2 == 0 ? first : second).Read(index);
+};
+
+// Waits in the message pump until everything is read and saved; without the system's timers it just waits.
+void WaitForReaders(Reader &first, Reader &second, Progress &progress) {
+    KTInt64 saveTimer = 0;
+    KTInt64 progressTimer = 0;
+    KTCreateTimer(&first, kSaveInterval, &saveTimer, kSave);
+    KTCreateUITimer(kProgressInterval, &progressTimer, &Progress::Show, &progress);
+    if (saveTimer != 0 && progressTimer != 0) {
+        PumpMessages();
+    } else {
+        KTKillUITimer(progressTimer);
+        second.WaitUntilAllIsRead();
+        first.WaitUntilAllIsRead();
+        first.WaitUntilSaved();
+    }
+    KTKillTimer(saveTimer); // posts to a thread that is about to end
+}
+
+} // namespace
+
+CourseReading ReadCourse(std::vector<CourseFile> const &files, RunLog &log) {
+    CourseReading reading;
+    for (CourseFile const &file : files) {
+        if (file.kind == FileKind::Text) {
+            reading.results.emplace_back().file = file;
         }
-        first.WaitUntilAllAreRead();
-        second.WaitUntilAllAreRead();
+    }
+    TimerService const timers;
+    Work work(reading.results, log);
+    Progress progress(work);
+    {
+        // Two, as each may hold a large file.
+        Reader first(1, work);
+        Reader second(2, work);
+        WaitForReaders(first, second, progress);
     } // both threads have ended here
-    return results;
+    reading.texts = work.autosave.Lines();
+    reading.saved = work.autosave.Saved();
+    reading.saves = work.autosave.Writes();
+    reading.shown = progress.shown;
+    return reading;
 }

@@ -7,6 +7,7 @@
 #include "RunLog.h"
 #include "TextFacts.h"
 
+#include <cstddef>
 #include <string>
 #include <vector>
 
@@ -27,5 +28,14 @@ struct TextResult {
 /// Reads up to this much of each file; more is not text that an author wrote.
 constexpr KTUInt64 kMostBytes = 32ULL << 20;
 
-/// Reads the text files among `files`. The results have the files' order.
-std::vector<TextResult> ReadCourse(std::vector<CourseFile> const &files, RunLog &log);
+/// What all of them gave, and how the work went.
+struct CourseReading {
+    std::vector<TextResult> results; ///< in the order of the files
+    std::size_t texts = 0;           ///< finished, also with a problem
+    std::size_t saved = 0;           ///< of these, in the last autosave
+    std::size_t saves = 0;
+    std::size_t shown = 0; ///< how often progress was shown
+};
+
+/// Reads the text files among `files`. Pumps the calling thread's messages meanwhile.
+CourseReading ReadCourse(std::vector<CourseFile> const &files, RunLog &log);

@@ -211,6 +211,16 @@ std::string ReportChecks(std::vector<TextResult> const &results) {
     return text + "\n";
 }
 
+std::string ReportWork(CourseReading const &reading) {
+    if (reading.texts == 0) {
+        return "";
+    }
+    return "Work\n  texts finished by two message threads: " + Number(reading.texts) + " of " +
+           Number(reading.results.size()) + "\n  texts in the autosave file: " + Number(reading.saved) + " of " +
+           Number(reading.texts) + ", written " + Count(reading.saves, "time") + "\n  progress shown " +
+           Count(reading.shown, "time") + "\n\n";
+}
+
 std::string ReportLog(RunLog const &log) {
     std::string const path = Printable(RunLog::FilePath().GetPathAsKTString());
     return "Log\n  " + path + "\n  " + Count(log.Lines(), "line") + " written, " + Number(RunLog::LinesInFile()) +

@@ -29,5 +29,8 @@ std::string ReportOtherFiles(CourseFolder const &folder, ReportLimits const &lim
 /// What converting back and forth showed.
 std::string ReportChecks(std::vector<TextResult> const &results);
 
+/// How the message threads and timers went about it.
+std::string ReportWork(CourseReading const &reading);
+
 /// Where the log is and how much is in it.
 std::string ReportLog(RunLog const &log);

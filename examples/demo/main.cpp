@@ -63,7 +63,8 @@ int Run(Console const &console, Options const &options) {
         CrashWhileSaving(console, folder);
         return Fail(console, log, "did not crash");
     }
-    std::vector<TextResult> results = ReadCourse(folder.files, log);
+    CourseReading reading = ReadCourse(folder.files, log);
+    std::vector<TextResult> &results = reading.results;
     std::vector<TextResult *> const languages = ChooseLanguages(results);
     LookTextsUp(languages);
     log.Step("languages loaded: " + std::to_string(languages.size()));
@@ -94,6 +95,7 @@ int Run(Console const &console, Options const &options) {
     console.Print(ReportMail());
     console.Print(ReportSystem(path));
     console.Print(ReportChecks(results));
+    console.Print(ReportWork(reading));
 
     bool const anyRead = std::any_of(results.begin(), results.end(), [](auto const &result) { return result.isRead; });
     bool const onlyOthers = results.empty() && !folder.files.empty();

@@ -29,6 +29,7 @@ bool IsWithin(int value, int least, int greatest) { return value >= least && val
 
 // The time that a test has set; 0 while the system's clock counts.
 std::atomic<KTUInt64> testClock{0};
+std::atomic<unsigned int> readings{0};
 
 KTUnits Widen(std::string const &text) { return {text.begin(), text.end()}; }
 
@@ -41,8 +42,11 @@ KTUInt64 OSystemTimeNow() {
 
 void OSetTestClock(KTUInt64 microseconds) { testClock = microseconds; }
 
+unsigned int OTestClockReadings() { return readings; }
+
 KTUInt64 OUtcMicroseconds() {
     KTUInt64 const set = testClock;
+    ++readings;
     auto const now = std::chrono::system_clock::now().time_since_epoch();
     return set != 0 ? set : static_cast<KTUInt64>(std::chrono::duration_cast<std::chrono::microseconds>(now).count());
 }

@@ -6,3 +6,6 @@
 
 /// OUtcMicroseconds gives this from now on; 0 gives it back to the system's clock. Any thread.
 void OSetTestClock(KTUInt64 microseconds);
+
+/// How often the clock has been read. Any thread.
+unsigned int OTestClockReadings();

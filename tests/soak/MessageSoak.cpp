@@ -3,6 +3,7 @@
 #include "MessageSoak.h"
 
 #include "KTThread.h"
+#include "SoakProgress.h"
 
 #include <boost/thread/thread.hpp>
 
@@ -10,8 +11,6 @@
 #include <memory>
 #include <random>
 #include <sstream>
-
-std::atomic<std::uint64_t> soakProgress{0};
 
 MessageFigures &MessageFigures::operator+=(MessageFigures const &other) {
     accepted += other.accepted;
@@ -81,7 +80,7 @@ class Producer {
     void Run(std::atomic<bool> const &stop) {
         while (!stop) {
             PostOne();
-            ++soakProgress;
+            SoakGetsOn(SoakPart::Messages);
         }
     }
 
@@ -169,7 +168,8 @@ std::string Compare(Consumers const &consumers, std::array<std::unique_ptr<Produ
 
 } // namespace
 
-std::string SoakMessages(unsigned int seed, std::chrono::milliseconds length, MessageFigures &figures) {
+std::string SoakMessages(unsigned int seed, std::chrono::milliseconds length, std::function<void()> const &turn,
+                         MessageFigures &figures) {
     Consumers consumers;
     for (std::size_t i = 0; i < kThreads; ++i) {
         consumers[i] = std::make_unique<Consumer>(i < kKept);
@@ -189,6 +189,7 @@ std::string SoakMessages(unsigned int seed, std::chrono::milliseconds length, Me
     auto const end = std::chrono::steady_clock::now() + length;
     while (running != 0) {
         Rescue(consumers);
+        turn();
         KTSleepForDuration(0, 2);
         stop = std::chrono::steady_clock::now() >= end;
     }

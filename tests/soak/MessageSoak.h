@@ -8,9 +8,9 @@
 
 #pragma once
 
-#include <atomic>
 #include <chrono>
 #include <cstdint>
+#include <functional>
 #include <string>
 
 /// What one round did.
@@ -24,9 +24,7 @@ struct MessageFigures {
     MessageFigures &operator+=(MessageFigures const &other);
 };
 
-/// Grows as long as producers get on; a watchdog looks at it.
-extern std::atomic<std::uint64_t> soakProgress;
-
-/// Runs producers and threads for that long and shuts them down in the order a host must. Returns what went wrong, one
-/// line each; nothing if all is well.
-std::string SoakMessages(unsigned int seed, std::chrono::milliseconds length, MessageFigures &figures);
+/// Runs producers and threads for that long, calling `turn` on the calling thread again and again, and shuts them down in
+/// the order a host must. Returns what went wrong, one line each; nothing if all is well.
+std::string SoakMessages(unsigned int seed, std::chrono::milliseconds length, std::function<void()> const &turn,
+                         MessageFigures &figures);

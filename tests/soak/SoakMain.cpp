@@ -7,10 +7,14 @@
 #include "KTThread.h"
 #include "MessageSoak.h"
 #include "ProcessFigures.h"
+#include "SoakProgress.h"
+#include "TimerSoak.h"
 
 #include <boost/thread/thread.hpp>
 
+#include <array>
 #include <atomic>
+#include <cstddef>
 #include <cstdio>
 #include <cstdlib>
 #include <random>
@@ -20,7 +24,7 @@ namespace {
 
 constexpr std::chrono::milliseconds kRound{2000};
 constexpr int kWarmUpRounds = 2;
-constexpr int kStandstill = 120; // seconds without any post
+constexpr int kStandstill = 120; // seconds in which a part does not get on
 constexpr std::uint64_t kHandleTolerance = 4;
 constexpr std::uint64_t kMemoryTolerance = std::uint64_t{8} << 20;
 
@@ -37,14 +41,17 @@ class Watchdog {
 
   private:
     void Watch() {
-        std::uint64_t last = 0;
-        for (int idle = 0; !m_Stop; KTSleepForDuration(0, 100)) {
-            std::uint64_t const now = soakProgress;
-            idle = now == last ? idle + 1 : 0;
-            last = now;
-            if (idle > kStandstill * 10) {
-                std::fputs("ktsoak: standstill\n", stderr);
-                std::_Exit(1);
+        std::array<std::uint64_t, kSoakParts> last{};
+        std::array<int, kSoakParts> idle{};
+        for (; !m_Stop; KTSleepForDuration(0, 100)) {
+            for (std::size_t part = 0; part < kSoakParts; ++part) {
+                std::uint64_t const now = soakProgress[part];
+                idle[part] = now == last[part] ? idle[part] + 1 : 0;
+                last[part] = now;
+                if (idle[part] > kStandstill * 10) {
+                    std::fprintf(stderr, "ktsoak: standstill of part %d\n", static_cast<int>(part));
+                    std::_Exit(1);
+                }
             }
         }
     }
@@ -61,16 +68,23 @@ bool Compare(char const *name, std::uint64_t before, std::uint64_t after, std::u
 
 unsigned long long Print(std::uint64_t value) { return value; }
 
+std::string SoakRound(unsigned int seed, MessageFigures &figures, TimerFigures &timerFigures) {
+    TimerSoak timers(seed);
+    std::string const problems = SoakMessages(seed, kRound, [&timers] { timers.Turn(); }, figures);
+    return problems + timers.Finish(timerFigures);
+}
+
 int Soak(std::chrono::seconds length, unsigned int seed) {
     std::printf("ktsoak: %lld s, seed %u\n", static_cast<long long>(length.count()), seed);
     MessageFigures figures;
+    TimerFigures timers;
     ProcessFigures before;
     int rounds = 0;
     {
         Watchdog const watchdog;
         auto const end = std::chrono::steady_clock::now() + length;
         while (rounds <= kWarmUpRounds || std::chrono::steady_clock::now() < end) {
-            std::string const problems = SoakMessages(seed + static_cast<unsigned int>(rounds) * 100, kRound, figures);
+            std::string const problems = SoakRound(seed + static_cast<unsigned int>(rounds) * 100, figures, timers);
             if (!problems.empty()) {
                 std::fprintf(stderr, "ktsoak: round %d\n%s", rounds, problems.c_str());
                 return 1;
@@ -84,6 +98,10 @@ int Soak(std::chrono::seconds length, unsigned int seed) {
                     "         %llu synchronous posts, %llu flushes\n",
                     rounds, Print(figures.accepted), Print(figures.handled), Print(figures.refused),
                     Print(figures.synchronous), Print(figures.flushes));
+        std::printf("timers   %llu created, %llu refused by full tables, %llu adjusted or restarted, %llu killed\n"
+                    "         %llu ticks, %llu bursts, %llu calls of UI timers\n",
+                    Print(timers.created), Print(timers.refused), Print(timers.adjusted), Print(timers.killed),
+                    Print(timers.ticks), Print(timers.bursts), Print(timers.calls));
         bool isClean = Compare("handles", before.handles, after.handles, kHandleTolerance);
         isClean = Compare("threads", before.threads, after.threads, 0) && isClean;
         isClean = Compare("bytes", before.bytes, after.bytes, kMemoryTolerance) && isClean;

@@ -39,6 +39,15 @@ class TestClock {
 
     KTUInt64 Now() const { return m_Now; }
 
+    /// How often the library has read the clock: shows that a thread waits for it.
+    static unsigned int Readings() {
+#if defined(_WIN32)
+        return readings;
+#else
+        return OTestClockReadings();
+#endif
+    }
+
   private:
     KTUInt64 m_Now;
 
@@ -46,11 +55,13 @@ class TestClock {
     static constexpr KTUInt64 kCountOf1970 = 116'444'736'000'000'000;
 
     static void WINAPI Show(FILETIME *time) {
+        ++readings;
         KTUInt64 const count = shown;
         *time = {static_cast<DWORD>(count), static_cast<DWORD>(count >> 32)};
     }
 
     static inline std::atomic<KTUInt64> shown{0};
+    static inline std::atomic<unsigned int> readings{0};
 
     WImportHook m_Hook{L"KTPublic.dll", "GetSystemTimeAsFileTime", Show};
 #endif

@@ -9,6 +9,7 @@
 
 #include <algorithm>
 #include <new>
+#include <typeinfo>
 
 namespace {
 
@@ -38,6 +39,13 @@ template <typename Value> inline void CKTStreamRead::ReadValue(Value &value) {
     }
 }
 
+// Whether a value made of several may be taken whole: its parts go through the virtual table only for those who derive.
+inline bool CKTStreamRead::IsPlain() const { return m_IsFile != 0 && typeid(*this) == typeid(CKTStreamRead); }
+
+template <typename Value> inline bool CKTStreamRead::TakeWhole(Value &value) {
+    return IsPlain() && OFileShortcut::Take(static_cast<FileXferBytes &>(*m_Transport), value);
+}
+
 // ---- bytes and text ----
 
 int CKTStreamRead::XferByte(unsigned char *buffer, int count) {
@@ -54,7 +62,26 @@ unsigned char CKTStreamRead::XferByte(unsigned char &value) {
     return value;
 }
 
+// Makes the text of the bytes read ahead, if its length and all of it are there. An empty one may be the file's last
+// value, which asks the file whether there is more.
+inline bool CKTStreamRead::TakeString(KTString &value, bool utf8, bool withCount) {
+    auto &file = static_cast<FileXferBytes &>(*m_Transport);
+    int count = 0;
+    if (!withCount) {
+        count = OStreamTextSize(value, utf8);
+    } else if (OFileShortcut::Peek(file, count)) {
+        count = m_Swapping == 0 ? count : OReversed(count);
+    }
+    unsigned int const before = withCount ? sizeof count : 0;
+    return count > 0 && OFileShortcut::Take(file, before, static_cast<unsigned int>(count), [&](auto const *bytes) {
+               OAssignStreamText(value, bytes, static_cast<std::size_t>(count), utf8);
+           });
+}
+
 KTString CKTStreamRead::XferString(KTString &value, bool utf8, bool withCount) try {
+    if (IsPlain() && TakeString(value, utf8, withCount)) {
+        return value;
+    }
     int count = 0; // stays so where the stream has ended
     if (withCount) {
         XferInt32(count);
@@ -85,7 +112,11 @@ int CKTStreamRead::XferBool(KTBool16 *values, int count) { return XferInt16(valu
 
 KTBool16 CKTStreamRead::XferBool(KTBool16 &value) {
     short number = value;
-    XferInt16(number);
+    if (IsPlain()) {
+        CKTStreamRead::XferInt16(number);
+    } else {
+        XferInt16(number);
+    }
     if (number != 0 && number != 1) {
         KTAssertFailed("CKTStreamRead::XferBool - this isn't a bool you are reading. Something's wrong.", kReportPath,
                        kBoolLine);
@@ -133,6 +164,10 @@ int CKTStreamRead::XferInt32(int &value) {
 }
 
 long long CKTStreamRead::XferInt64(long long &value) {
+    if (long long bytes = 0; TakeWhole(bytes)) {
+        value = m_Swapping == 0 ? OHalvesExchanged(bytes) : OReversed(bytes);
+        return value;
+    }
     int high = OHighHalf(value);
     int low = OLowHalf(value);
     XferInt32(high);
@@ -179,6 +214,10 @@ bool CKTStreamRead::ReadReal(KTReal &value) {
     double number = value.AsDouble();
     auto *const bytes = reinterpret_cast<unsigned char *>(&number);
     constexpr int size = sizeof number;
+    if (m_Swapping == 0 && TakeWhole(number)) {
+        value = number;
+        return true;
+    }
     int const read = m_Swapping == 0 ? XferByte(bytes, size) : XferByteReverse(bytes, size);
     value = number;
     return read == size;

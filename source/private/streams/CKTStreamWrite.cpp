@@ -7,7 +7,9 @@
 #include "OFileShortcut.h"
 #include "OStreamText.h"
 
+#include <cstring>
 #include <new>
+#include <typeinfo>
 
 namespace {
 
@@ -40,6 +42,13 @@ template <typename Value> inline void CKTStreamWrite::WriteValue(Value const &va
     }
 }
 
+// Whether a value made of several may be put whole: its parts go through the virtual table only for those who derive.
+inline bool CKTStreamWrite::IsPlain() const { return m_IsFile != 0 && typeid(*this) == typeid(CKTStreamWrite); }
+
+template <typename Value> inline bool CKTStreamWrite::PutWhole(Value const &value) {
+    return IsPlain() && OFileShortcut::Put(static_cast<FileXferBytes &>(*m_Transport), value);
+}
+
 inline unsigned int CKTStreamWrite::WriteBytes(void *bytes, unsigned int count) {
     auto const copy = [=](unsigned char *to) { OCopyBytes(to, static_cast<unsigned char const *>(bytes), count); };
     if (m_IsFile != 0 && OFileShortcut::Put(static_cast<FileXferBytes &>(*m_Transport), count, copy)) {
@@ -59,7 +68,28 @@ unsigned char CKTStreamWrite::XferByte(unsigned char &value) {
     return value;
 }
 
+// Encodes the text where it is to lie, if it needs no conversion but of the size of its characters.
+inline bool CKTStreamWrite::PutString(KTString const &value, bool utf8, bool withCount) {
+    std::size_t const units = value.size();
+    if (units > kOShortTextUnits) {
+        return false;
+    }
+    auto const count = static_cast<int>(utf8 ? units : units * sizeof(unsigned short));
+    unsigned int const before = withCount ? sizeof count : 0;
+    return OFileShortcut::PutIf(static_cast<FileXferBytes &>(*m_Transport), before + static_cast<unsigned int>(count),
+                                [&](unsigned char *to) {
+                                    if (withCount) {
+                                        int const stored = m_Swapping == 0 ? count : OReversed(count);
+                                        std::memcpy(to, &stored, sizeof stored);
+                                    }
+                                    return OPutStreamText(value, to + before, utf8);
+                                });
+}
+
 KTString CKTStreamWrite::XferString(KTString &value, bool utf8, bool withCount) try {
+    if (IsPlain() && PutString(value, utf8, withCount)) {
+        return value;
+    }
     OStreamTextWriter const text(value, utf8);
     if (withCount) {
         int count = static_cast<int>(text.Count());
@@ -94,6 +124,9 @@ KTBool16 CKTStreamWrite::XferBool(KTBool16 &value) {
         KTAssertFailed("CStreamWrite::XferBool - this isn't a bool you are writing", kReportPath, kBoolLine);
     }
     value = value != 0 ? 1 : 0;
+    if (IsPlain()) {
+        return CKTStreamWrite::XferInt16(value);
+    }
     XferInt16(value);
     return value;
 }
@@ -129,6 +162,9 @@ int CKTStreamWrite::XferInt32(int &value) {
 }
 
 long long CKTStreamWrite::XferInt64(long long &value) {
+    if (PutWhole(m_Swapping == 0 ? OHalvesExchanged(value) : OReversed(value))) {
+        return value;
+    }
     int high = OHighHalf(value);
     int low = OLowHalf(value);
     XferInt32(high);
@@ -167,7 +203,9 @@ KTReal &CKTStreamWrite::XferRealNumber(KTReal &value) {
     double number = value.AsDouble();
     auto *const bytes = reinterpret_cast<unsigned char *>(&number);
     if (m_Swapping == 0) {
-        XferByte(bytes, sizeof number);
+        if (!PutWhole(number)) {
+            XferByte(bytes, sizeof number);
+        }
     } else {
         XferByteReverse(bytes, sizeof number);
     }

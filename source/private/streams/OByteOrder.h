@@ -16,6 +16,17 @@ inline int OReversed(int value) noexcept {
     auto const bits = static_cast<std::uint32_t>(value);
     return static_cast<int>(bits << 24 | (bits & 0xFF00U) << 8 | (bits >> 8 & 0xFF00U) | bits >> 24);
 }
+inline long long OReversed(long long value) noexcept {
+    auto const bits = static_cast<std::uint64_t>(value);
+    auto const low = static_cast<std::uint32_t>(OReversed(static_cast<int>(bits >> 32)));
+    auto const high = static_cast<std::uint32_t>(OReversed(static_cast<int>(bits & 0xFFFFFFFFU)));
+    return static_cast<long long>(static_cast<std::uint64_t>(high) << 32 | low);
+}
+
+/// The number with its upper half below its lower one, as it lies in a stream without swapping.
+inline long long OHalvesExchanged(long long value) noexcept {
+    return static_cast<long long>(std::rotl(static_cast<std::uint64_t>(value), 32));
+}
 
 /// The two halves of a 64-bit number, and the number that they make.
 inline int OHighHalf(long long value) noexcept { return static_cast<int>(value >> 32); }

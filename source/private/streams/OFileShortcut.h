@@ -68,6 +68,29 @@ class OFileShortcut {
         return true;
     }
 
+    /// Takes `before` bytes and `count` behind them, and copies those, if all are there. REQUIRES: count is not 0; the
+    /// first ones are as few as a value's.
+    template <typename Copy> static bool Take(FileXferBytes &file, unsigned int before, unsigned int count, Copy copy) {
+        unsigned int const available = file.m_ReadAheadFill - file.m_ReadAheadCursor;
+        if (available < before || count > available - before || file.m_WriteFill != 0) {
+            return false;
+        }
+        auto const *const from = file.m_ReadAheadBuffer + file.m_ReadAheadCursor + before;
+        CountRead(file, before + count);
+        file.m_ReadAheadCursor += before + count;
+        copy(from); // which may throw: the bytes have been read nevertheless
+        return true;
+    }
+
+    /// The next value of the bytes read ahead, which it leaves there; false, and nothing done, if they are too few.
+    template <typename Value> static bool Peek(FileXferBytes const &file, Value &value) {
+        if (sizeof value > file.m_ReadAheadFill - file.m_ReadAheadCursor) {
+            return false;
+        }
+        std::memcpy(&value, file.m_ReadAheadBuffer + file.m_ReadAheadCursor, sizeof value);
+        return true;
+    }
+
     /// Puts the value behind the bytes gathered; false, and nothing done, without room or buffer.
     template <typename Value> static bool Put(FileXferBytes &file, Value const &value) {
         return Put(file, sizeof value, [&](unsigned char *to) { std::memcpy(to, &value, sizeof value); });
@@ -75,11 +98,18 @@ class OFileShortcut {
 
     /// The same by copy(to).
     template <typename Copy> static bool Put(FileXferBytes &file, unsigned int count, Copy copy) {
+        return PutIf(file, count, [&](unsigned char *to) {
+            copy(to);
+            return true;
+        });
+    }
+
+    /// The same by copy(to), where nothing counts as put unless it returns true.
+    template <typename Copy> static bool PutIf(FileXferBytes &file, unsigned int count, Copy copy) {
         auto const fill = static_cast<unsigned int>(file.m_WriteFill);
-        if (file.m_WriteBuffer == nullptr || count > file.m_WriteCapacity - fill) {
+        if (file.m_WriteBuffer == nullptr || count > file.m_WriteCapacity - fill || !copy(file.m_WriteBuffer + fill)) {
             return false;
         }
-        copy(file.m_WriteBuffer + fill);
         file.m_WriteFill = static_cast<int>(fill + count);
         return true;
     }

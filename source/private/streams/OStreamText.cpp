@@ -3,6 +3,7 @@
 #include "OStreamText.h"
 
 #include "KTAssert.h"
+#include "OUtfBlocks.h"
 
 #include <algorithm>
 #include <cstring>
@@ -13,15 +14,117 @@ namespace {
 
 constexpr int kFirstPiece = 0x40000; // memory that a length in front of a text may ask for before any byte has come
 
-// Copies the characters one by one, from bytes to units or back. Whether all were ASCII, and none of them zero.
-template <typename From, typename To> bool CopyAscii(From const *from, std::size_t count, To *to) {
-    unsigned int all = 0;
-    for (std::size_t i = 0; i < count; ++i) {
-        auto const character = static_cast<unsigned int>(static_cast<std::make_unsigned_t<From>>(from[i]));
-        all |= character | (character - 1); // a zero sets all bits
-        to[i] = static_cast<To>(character);
+// ASCII is copied in blocks, the last of which overlaps the one before; so no character is copied alone but in texts of
+// less than four.
+
+using OUtf::HighBits;
+using OUtf::Load;
+using OUtf::LoadAs;
+using OUtf::Store;
+using OUtf::StoreAs;
+
+// One character to a unit each.
+struct Widen16 {
+    static constexpr std::size_t kSize = 16;
+    bool operator()(char const *from, unsigned short *to) const {
+        __m128i const bytes = Load(from);
+        OUtf::WidenBlock(bytes, to);
+        return HighBits(_mm_cmpgt_epi8(bytes, _mm_setzero_si128())) == 0xFFFF;
     }
-    return all < 0x80;
+};
+template <typename Few> struct Widen {
+    static constexpr std::size_t kSize = sizeof(Few);
+    bool operator()(char const *from, unsigned short *to) const {
+        __m128i const bytes = _mm_cvtsi64_si128(static_cast<long long>(LoadAs<Few>(from)));
+        __m128i const units = _mm_unpacklo_epi8(bytes, _mm_setzero_si128());
+        if constexpr (kSize == 8) {
+            Store(to, units);
+        } else {
+            StoreAs(to, _mm_cvtsi128_si64(units));
+        }
+        constexpr unsigned int kAll = (1U << kSize) - 1;
+        return HighBits(_mm_cmpgt_epi8(bytes, _mm_setzero_si128())) == kAll;
+    }
+};
+
+// One unit to a character each.
+struct Narrow8 {
+    static constexpr std::size_t kSize = 8;
+    bool operator()(unsigned short const *from, unsigned char *to) const {
+        __m128i const units = Load(from);
+        StoreAs(to, _mm_cvtsi128_si64(_mm_packus_epi16(units, units)));
+        __m128i const other = _mm_and_si128(units, _mm_set1_epi16(static_cast<short>(0xFF80)));
+        return HighBits(_mm_cmpeq_epi16(other, _mm_setzero_si128())) == 0xFFFF;
+    }
+};
+struct Narrow4 {
+    static constexpr std::size_t kSize = 4;
+    bool operator()(unsigned short const *from, unsigned char *to) const {
+        auto const four = LoadAs<std::uint64_t>(from);
+        __m128i const units = _mm_cvtsi64_si128(static_cast<long long>(four));
+        StoreAs(to, _mm_cvtsi128_si32(_mm_packus_epi16(units, units)));
+        return (four & 0xFF80FF80FF80FF80U) == 0;
+    }
+};
+
+// REQUIRES: at least one block.
+template <typename Block, typename From, typename To>
+bool CopyBlocks(From const *from, std::size_t count, To *to, Block block) {
+    bool isPlain = true;
+    for (std::size_t i = 0; i + Block::kSize < count; i += Block::kSize) {
+        isPlain &= block(from + i, to + i);
+    }
+    std::size_t const last = count - Block::kSize;
+    return block(from + last, to + last) && isPlain;
+}
+
+// Whether all are ASCII and none of them is zero; each has its unit then.
+bool WidenPlain(char const *from, std::size_t count, unsigned short *to) {
+    if (count >= Widen16::kSize) {
+        return CopyBlocks(from, count, to, Widen16());
+    }
+    if (count >= 8) {
+        return CopyBlocks(from, count, to, Widen<std::uint64_t>());
+    }
+    if (count >= 4) {
+        return CopyBlocks(from, count, to, Widen<std::uint32_t>());
+    }
+    bool isPlain = true;
+    for (std::size_t i = 0; i < count; ++i) {
+        to[i] = static_cast<unsigned char>(from[i]);
+        isPlain &= from[i] > 0;
+    }
+    return isPlain;
+}
+
+// Whether all are ASCII, zeros among them; each has its byte then.
+bool NarrowPlain(unsigned short const *from, std::size_t count, unsigned char *to) {
+    if (count >= Narrow8::kSize) {
+        return CopyBlocks(from, count, to, Narrow8());
+    }
+    if (count >= Narrow4::kSize) {
+        return CopyBlocks(from, count, to, Narrow4());
+    }
+    bool isPlain = true;
+    for (std::size_t i = 0; i < count; ++i) {
+        to[i] = static_cast<unsigned char>(from[i]);
+        isPlain &= from[i] < 0x80;
+    }
+    return isPlain;
+}
+
+// Whole units of UTF-16, which may lie at any address.
+void AssignUnits(KTString &text, unsigned char const *bytes, std::size_t count) {
+    if (count > kOShortTextUnits) {
+        text.assign(count, 0);
+        std::memcpy(&text[0], bytes, count * sizeof(unsigned short));
+        return;
+    }
+    unsigned short units[kOShortTextUnits];
+    if (count != 0) {
+        std::memcpy(units, bytes, count * sizeof(unsigned short));
+    }
+    text.assign(units, count);
 }
 
 } // namespace
@@ -38,13 +141,37 @@ void OReportNoMemory(char const *message, char const *path, int line) noexcept {
     }
 }
 
+void OAssignStreamText(KTString &text, unsigned char const *bytes, std::size_t count, bool utf8) {
+    if (!utf8) {
+        AssignUnits(text, bytes, count / sizeof(unsigned short));
+        return;
+    }
+    unsigned short units[kOShortTextUnits];
+    auto const *const characters = reinterpret_cast<char const *>(bytes);
+    if (count <= kOShortTextUnits && WidenPlain(characters, count, units)) {
+        text.assign(units, count);
+    } else {
+        auto const *const zero = static_cast<char const *>(std::memchr(characters, 0, count));
+        std::size_t const length = zero == nullptr ? count : static_cast<std::size_t>(zero - characters);
+        text = KTString(OString::FromUTF8({characters, length}));
+    }
+}
+
+bool OPutStreamText(KTString const &text, unsigned char *to, bool utf8) noexcept {
+    if (utf8) {
+        return NarrowPlain(text.c_str(), text.size(), to);
+    }
+    std::memcpy(to, text.c_str(), text.size() * sizeof(unsigned short));
+    return true;
+}
+
 // NOLINTNEXTLINE(cppcoreguidelines-pro-type-member-init): the array is written as far as it is used
 OStreamTextWriter::OStreamTextWriter(KTString const &text, bool utf8) {
     std::size_t count = text.size();
     if (!utf8) {
         m_Bytes = const_cast<unsigned short *>(text.c_str());
         count *= sizeof(unsigned short);
-    } else if (count <= kOShortTextUnits && CopyAscii(text.c_str(), count, m_Short)) {
+    } else if (count <= kOShortTextUnits && NarrowPlain(text.c_str(), count, m_Short)) {
         m_Bytes = m_Short;
     } else {
         m_Long = text.GetUTF8String();
@@ -71,17 +198,5 @@ int OStreamTextReader::MakeRoom(int count) {
 }
 
 void OStreamTextReader::Assign(KTString &text, bool utf8) const {
-    auto const count = static_cast<std::size_t>(m_Count);
-    if (!utf8) {
-        text.assign(m_Units, count / sizeof(unsigned short));
-        return;
-    }
-    auto const *const bytes = reinterpret_cast<char const *>(m_Units);
-    unsigned short units[kOShortTextUnits];
-    if (count <= kOShortTextUnits && CopyAscii(bytes, count, units)) {
-        text.assign(units, count);
-        return;
-    }
-    auto const *const zero = static_cast<char const *>(std::memchr(bytes, 0, count));
-    text = KTString(OString::FromUTF8({bytes, zero == nullptr ? count : static_cast<std::size_t>(zero - bytes)}));
+    OAssignStreamText(text, reinterpret_cast<unsigned char const *>(m_Units), static_cast<std::size_t>(m_Count), utf8);
 }

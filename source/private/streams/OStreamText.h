@@ -17,6 +17,13 @@ void OReportNoMemory(char const *message, char const *path, int line) noexcept;
 /// Short texts need no memory from the heap.
 inline constexpr std::size_t kOShortTextUnits = 256;
 
+/// Makes the text of the bytes of one: UTF-8 up to the first zero byte, or whole units of UTF-16. Throws std::bad_alloc.
+void OAssignStreamText(KTString &text, unsigned char const *bytes, std::size_t count, bool utf8);
+
+/// Puts a short text where it is to lie: all UTF-16, and UTF-8 of ASCII. False if it is anything else; what then lies
+/// there is nothing. REQUIRES: room for the bytes, one for each character if they are UTF-8.
+bool OPutStreamText(KTString const &text, unsigned char *to, bool utf8) noexcept;
+
 /// The bytes of a text that is to be written. REQUIRES: the text stays as it is meanwhile.
 class OStreamTextWriter {
   public:
@@ -34,7 +41,7 @@ class OStreamTextWriter {
     void *m_Bytes;
     unsigned int m_Count;
     std::string m_Long;
-    char m_Short[kOShortTextUnits]; // only what is used is ever written
+    unsigned char m_Short[kOShortTextUnits]; // only what is used is ever written
 };
 
 /// The bytes of a text that is read. Their number comes from the stream and is not trusted: memory is taken in pieces,

@@ -10,21 +10,6 @@ namespace {
 
 constexpr std::size_t kUnit = sizeof(unsigned short);
 
-// What a stored text looks like as units: itself, or, where it is not aligned or is multibyte, a copy.
-UnitsView StoredUnits(unsigned char const *bytes, std::size_t length, int encoding, KTUnits &scratch) {
-    if (encoding != kEncodingNone) {
-        scratch = MultibyteToUnits(encoding, {reinterpret_cast<char const *>(bytes), length});
-        return scratch;
-    }
-    std::size_t const count = length / kUnit;
-    if (reinterpret_cast<std::uintptr_t>(bytes) % kUnit == 0) {
-        return {reinterpret_cast<unsigned short const *>(bytes), count};
-    }
-    scratch.resize(count);
-    std::memcpy(scratch.data(), bytes, count * kUnit);
-    return scratch;
-}
-
 std::size_t RoundedUp(std::size_t size) noexcept { return (size + kUnit - 1) / kUnit * kUnit; }
 
 } // namespace
@@ -65,13 +50,19 @@ void DictionaryBlock::SetMark(std::uint32_t position, std::uint32_t mark) noexce
     }
 }
 
-UnitsView DictionaryBlock::Value(std::uint32_t position, KTUnits &scratch) const {
-    if (position < m_File.count) {
-        FileRecord const &record = m_File.records[position];
-        return StoredUnits(m_File.values + record.valueOffset, record.valueLength, m_File.encoding, scratch);
+std::string_view DictionaryBlock::ValueBytes(std::uint32_t position, KTUnits &scratch) const {
+    if (position >= m_File.count) {
+        AddedRecord const &record = Added(position - m_File.count);
+        return {reinterpret_cast<char const *>(record.key + RoundedUp(record.keyLength)), record.valueLength};
     }
-    AddedRecord const &record = Added(position - m_File.count);
-    return StoredUnits(record.key + RoundedUp(record.keyLength), record.valueLength, kEncodingNone, scratch);
+    FileRecord const &record = m_File.records[position];
+    std::string_view const stored(reinterpret_cast<char const *>(m_File.values + record.valueOffset),
+                                  record.valueLength);
+    if (m_File.encoding == kEncodingNone) {
+        return stored.substr(0, stored.size() / kUnit * kUnit);
+    }
+    scratch = MultibyteToUnits(m_File.encoding, stored);
+    return BytesOf(scratch);
 }
 
 void DictionaryBlock::Add(std::string_view key, UnitsView value) {

@@ -74,8 +74,9 @@ class DictionaryBlock {
     bool IsReplaced(std::uint32_t position) const noexcept { return Mark(position) == kReplacedMark; }
     void SetMark(std::uint32_t position, std::uint32_t mark) noexcept;
 
-    /// REQUIRES: alive and not replaced.
-    UnitsView Value(std::uint32_t position, KTUnits &scratch) const;
+    /// A text's units in the host's byte order, as bytes, which may begin at an odd address. In `scratch` where the
+    /// stored form is another one. REQUIRES: alive and not replaced.
+    std::string_view ValueBytes(std::uint32_t position, KTUnits &scratch) const;
 
     /// Appends an entry. REQUIRES: both sizes fit in 32 bits, the text's bytes below the marks.
     void Add(std::string_view key, UnitsView value);

@@ -48,11 +48,25 @@ std::uint64_t BufferedSource::Left() const {
     return size > Position() ? size - Position() : 0;
 }
 
-std::size_t BufferedSource::TakeRest(unsigned char *bytes) {
-    std::size_t const room = static_cast<std::size_t>(Left());
+std::shared_ptr<DictionaryBuffer> BufferedSource::TakeRest(bool mayMap) {
+    std::shared_ptr<DictionaryBuffer> rest;
+    if (mayMap && Position() == 0) {
+        rest = m_Source.Map();
+    }
+    if (rest == nullptr) {
+        auto const own = std::make_shared<OwnBuffer>(static_cast<std::size_t>(Left()));
+        own->Shorten(ReadRest(own->Bytes(), own->Size()));
+        rest = own;
+    }
+    m_Piece.reset();
+    m_Before = m_Source.Size();
+    m_At = m_End = 0;
+    return rest;
+}
+
+std::size_t BufferedSource::ReadRest(unsigned char *bytes, std::size_t room) {
     std::size_t done = std::min(room, m_End - m_At);
     std::memcpy(bytes, m_Piece.get() + m_At, done);
-    m_Piece.reset();
     while (done < room) {
         std::size_t const got = m_Source.Read(bytes + done, room - done);
         if (got == 0) {
@@ -60,8 +74,6 @@ std::size_t BufferedSource::TakeRest(unsigned char *bytes) {
         }
         done += got;
     }
-    m_Before = m_Source.Size();
-    m_At = m_End = 0;
     return done;
 }
 

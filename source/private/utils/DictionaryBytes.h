@@ -4,6 +4,8 @@
 //                                    DictionaryBuffer <--cursor-- binary form
 //     any form --ByteSink--> file or memory
 //
+// A DictionaryBuffer is memory of its own or a view of the file, whichever the source thinks better.
+//
 // No class here is locked; distinct objects may be used from any thread.
 
 #pragma once
@@ -18,6 +20,93 @@
 #include <string_view>
 
 namespace orvik_private {
+
+/// Whether two runs are equal. Keys are short and compared all the time, which is why no function of the run-time
+/// library is called for it: 8 bytes at a time, the last of them together with some that were there before.
+inline bool EqualBytes(std::string_view left, std::string_view right) noexcept {
+    std::size_t const size = left.size();
+    if (size != right.size()) {
+        return false;
+    }
+    auto const differ = [&](std::size_t at) {
+        std::uint64_t a = 0;
+        std::uint64_t b = 0;
+        std::memcpy(&a, left.data() + at, sizeof a);
+        std::memcpy(&b, right.data() + at, sizeof b);
+        return a ^ b;
+    };
+    constexpr std::size_t kWord = sizeof(std::uint64_t);
+    if (size >= kWord) {
+        std::uint64_t difference = differ(size - kWord);
+        for (std::size_t at = 0; at + kWord < size && difference == 0; at += kWord) {
+            difference = differ(at);
+        }
+        return difference == 0;
+    }
+    for (std::size_t at = 0; at < size; ++at) {
+        if (left[at] != right[at]) {
+            return false;
+        }
+    }
+    return true;
+}
+
+/// The first place of a byte, or the size: 16 bytes at a time, for the same reason.
+inline std::size_t FindByte(std::string_view bytes, char byte) noexcept {
+    constexpr std::size_t kAtOnce = 16;
+    std::size_t at = 0;
+    for (; at + kAtOnce <= bytes.size(); at += kAtOnce) {
+        bool isThere = false;
+        for (std::size_t i = 0; i < kAtOnce; ++i) {
+            isThere |= bytes[at + i] == byte;
+        }
+        if (isThere) {
+            break;
+        }
+    }
+    while (at < bytes.size() && bytes[at] != byte) {
+        ++at;
+    }
+    return at;
+}
+
+/// A whole binary file in memory, which a dictionary's entries go on pointing into. Its bytes may be changed; the file
+/// does not see it.
+class DictionaryBuffer {
+  public:
+    DictionaryBuffer() = default;
+    DictionaryBuffer(DictionaryBuffer const &) = delete;
+    DictionaryBuffer &operator=(DictionaryBuffer const &) = delete;
+    virtual ~DictionaryBuffer() = default;
+
+    unsigned char *Bytes() const noexcept { return m_Bytes; }
+    std::size_t Size() const noexcept { return m_Size; }
+
+  protected:
+    void SetBytes(unsigned char *bytes, std::size_t size) noexcept {
+        m_Bytes = bytes;
+        m_Size = size;
+    }
+
+  private:
+    unsigned char *m_Bytes = nullptr;
+    std::size_t m_Size = 0;
+};
+
+/// Memory that the buffer owns. Its contents are indeterminate at first.
+class OwnBuffer final : public DictionaryBuffer {
+  public:
+    /// Throws std::bad_alloc.
+    explicit OwnBuffer(std::size_t size) : m_Own(std::make_unique_for_overwrite<unsigned char[]>(size)) {
+        SetBytes(m_Own.get(), size);
+    }
+
+    /// Leaves the first bytes only. REQUIRES: size <= Size().
+    void Shorten(std::size_t size) noexcept { SetBytes(m_Own.get(), size); }
+
+  private:
+    std::unique_ptr<unsigned char[]> m_Own;
+};
 
 /// Where bytes come from, from the first to the last.
 class ByteSource {
@@ -35,6 +124,10 @@ class ByteSource {
 
     /// Whether the device failed on the way.
     virtual bool Failed() const = 0;
+
+    /// All of the source's bytes, whatever has been read of them, without reading them; null when they are better read.
+    /// Nothing can be read afterwards if it is not null.
+    virtual std::shared_ptr<DictionaryBuffer> Map() { return nullptr; }
 };
 
 /// Where bytes go to.
@@ -98,14 +191,15 @@ class BufferedSource {
     /// Bytes of the source that have not been taken.
     std::uint64_t Left() const;
 
-    /// Reads what is left into `bytes`, which has room for Left() of them; the number read, fewer if the source failed
-    /// or got shorter. The buffer is given back, and there is nothing more to take.
-    std::size_t TakeRest(unsigned char *bytes);
+    /// What is left, fewer bytes if the source failed or got shorter. There is nothing more to take then. With
+    /// `mayMap`, and if nothing has been taken yet, it may be a view of the file.
+    std::shared_ptr<DictionaryBuffer> TakeRest(bool mayMap);
 
     bool Failed() const { return m_Source.Failed(); }
 
   private:
     bool Fill();
+    std::size_t ReadRest(unsigned char *bytes, std::size_t room);
 
     ByteSource &m_Source;
     std::unique_ptr<unsigned char[]> m_Piece;
@@ -124,12 +218,6 @@ class DamagedFile : public std::runtime_error {
 
   private:
     std::uint64_t m_Offset;
-};
-
-/// A binary file in memory, which a dictionary's entries go on pointing into.
-struct DictionaryBuffer {
-    std::unique_ptr<unsigned char[]> bytes;
-    std::size_t size = 0;
 };
 
 /// Reads the fields of a binary file in memory. Every read is checked against the end of the bytes and throws

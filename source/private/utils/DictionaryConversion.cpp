@@ -4,6 +4,7 @@
 
 #include "OUtf.h"
 
+#include <cstring>
 #include <limits>
 
 namespace orvik_private {
@@ -17,6 +18,16 @@ constexpr std::size_t kMostBytes = std::numeric_limits<std::int32_t>::max();
 
 char const *TextConversionException::what() const noexcept {
     return m_Code == kBufferTooSmall ? "text conversion: the buffer is too small" : "text conversion failed";
+}
+
+UnitsView UnitsOf(std::string_view bytes, KTUnits &scratch) {
+    std::size_t const count = bytes.size() / sizeof(unsigned short);
+    if (reinterpret_cast<std::uintptr_t>(bytes.data()) % sizeof(unsigned short) == 0) {
+        return {reinterpret_cast<unsigned short const *>(bytes.data()), count};
+    }
+    scratch.resize(count);
+    std::memcpy(scratch.data(), bytes.data(), count * sizeof(unsigned short));
+    return scratch;
 }
 
 std::size_t ConvertMultibyte(int encoding, std::string_view bytes, unsigned short *units, std::size_t capacity) {

@@ -17,6 +17,14 @@ namespace orvik_private {
 
 using UnitsView = std::basic_string_view<unsigned short, KTUnitTraits>;
 
+/// The units as bytes, in the host's byte order.
+inline std::string_view BytesOf(UnitsView units) noexcept {
+    return {reinterpret_cast<char const *>(units.data()), units.size() * sizeof(unsigned short)};
+}
+
+/// The reverse: where they are if their address is even, else in `scratch`.
+UnitsView UnitsOf(std::string_view bytes, KTUnits &scratch);
+
 constexpr int kEncodingNone = 0;
 constexpr int kEncodingUtf8 = 1;
 constexpr int kEncodingAnsi = 2;

@@ -44,11 +44,11 @@ void DictionaryBinaryReader::Report(DictionaryProblemKind kind, std::uint64_t of
 }
 
 void DictionaryBinaryReader::Read(BufferedSource &source) {
-    auto const file = std::make_shared<DictionaryBuffer>();
-    std::uint64_t const size = source.Left();
-    file->bytes = std::make_unique_for_overwrite<unsigned char[]>(static_cast<std::size_t>(size));
-    file->size = source.TakeRest(file->bytes.get());
-    ByteCursor cursor(file->bytes.get(), file->size);
+    // Files of version 1 are small and old; they are read, so that only one kind of entry depends on a mapped file.
+    std::string_view const head = source.Peek(kDictionaryMagic.size() + 1);
+    bool const isVersion2 = head.size() > kDictionaryMagic.size() && head.back() == 2;
+    std::shared_ptr<DictionaryBuffer> const file = source.TakeRest(isVersion2);
+    ByteCursor cursor(file->Bytes(), file->Size());
     try {
         ReadBody(cursor, file);
     } catch (DamagedFile const &damage) {
@@ -57,7 +57,7 @@ void DictionaryBinaryReader::Read(BufferedSource &source) {
         Report(DictionaryProblemKind::Damaged, cursor.Position(), problem.what());
     }
     if (source.Failed()) {
-        Report(DictionaryProblemKind::ReadFailed, file->size, "the file could not be read to its end");
+        Report(DictionaryProblemKind::ReadFailed, file->Size(), "the file could not be read to its end");
     }
 }
 

@@ -42,9 +42,9 @@ KeyText SplitKeyText(std::string_view text) noexcept {
         }
         text.remove_prefix(kDollars.size());
     }
-    std::size_t const equals = text.find('=');
+    std::size_t const equals = FindByte(text, '=');
     key.name = text.substr(0, equals);
-    key.hasDefault = equals != std::string_view::npos;
+    key.hasDefault = equals != text.size();
     key.defaultText = key.hasDefault ? text.substr(equals + 1) : std::string_view();
     return key;
 }
@@ -68,31 +68,40 @@ std::int64_t DictionaryReader::Add(std::string_view keyText, UnitsView value) {
     return m_Array->Add(SplitKeyText(keyText).name, value); // which takes no empty one
 }
 
-bool DictionaryReader::FindValue(std::string_view name, KTUnits &scratch, UnitsView &text) const {
+bool DictionaryReader::FindBytes(std::string_view name, KTUnits &scratch, std::string_view &bytes) const {
     if (m_Version.major < 2) {
         DictionaryEntry const *const entry = m_Legacy.Find(name);
         if (entry == nullptr) {
             return false;
         }
         scratch = entry->Value().Units();
-        text = scratch;
+        bytes = BytesOf(scratch);
         return true;
     }
     std::int64_t const index = m_Array->Find(name);
     if (index < 0) {
         return false;
     }
-    text = m_Array->Value(static_cast<std::uint32_t>(index), scratch);
+    bytes = m_Array->ValueBytes(static_cast<std::uint32_t>(index), scratch);
     return true;
 }
 
-bool DictionaryReader::LookupName(std::string_view name, KTUnits &scratch, UnitsView &text) const {
+bool DictionaryReader::LookupBytes(std::string_view name, KTUnits &scratch, std::string_view &bytes) const {
     if (name.empty()) {
         return false;
     }
     DictionaryReader const *const other = defaultDictionary;
-    return FindValue(name, scratch, text) ||
-           (other != nullptr && other != this && other->FindValue(name, scratch, text));
+    return FindBytes(name, scratch, bytes) ||
+           (other != nullptr && other != this && other->FindBytes(name, scratch, bytes));
+}
+
+bool DictionaryReader::LookupName(std::string_view name, KTUnits &scratch, UnitsView &text) const {
+    std::string_view bytes;
+    if (!LookupBytes(name, scratch, bytes)) {
+        return false;
+    }
+    text = UnitsOf(bytes, scratch);
+    return true;
 }
 
 DictionaryFound DictionaryReader::Lookup(std::string_view keyText, KTUnits &scratch, UnitsView &text,

@@ -126,6 +126,9 @@ class DictionaryReader {
     /// The first part of that for a name alone: here, then in the default dictionary. False if neither has it.
     bool LookupName(std::string_view name, KTUnits &scratch, UnitsView &text) const;
 
+    /// The same, the text as the bytes of its units, which may begin at an odd address: nothing is copied for that.
+    bool LookupBytes(std::string_view name, KTUnits &scratch, std::string_view &bytes) const;
+
     FastArray const &Array() const noexcept { return *m_Array; }
     LegacyTable const &Legacy() const noexcept { return m_Legacy; }
 
@@ -160,7 +163,7 @@ class DictionaryReader {
     friend class DictionaryBinaryReader; // the forms' own files work on the stores directly
     friend class DictionaryTextReader;
 
-    bool FindValue(std::string_view name, KTUnits &scratch, UnitsView &text) const;
+    bool FindBytes(std::string_view name, KTUnits &scratch, std::string_view &bytes) const;
     void WriteForm(ByteSink &sink, DictionaryForm const &form, DictionaryObserver *observer) const;
 
     DictionaryVersion m_Version;

@@ -47,17 +47,21 @@ bool FastArray::IsAlive(std::uint32_t index) const noexcept {
     return block.IsAlive(index - block.Base());
 }
 
-UnitsView FastArray::Value(std::uint32_t index, KTUnits &scratch) const {
+std::string_view FastArray::ValueBytes(std::uint32_t index, KTUnits &scratch) const {
     DictionaryBlock const &block = BlockOf(index);
     std::uint32_t const position = index - block.Base();
     if (block.IsReplaced(position)) {
-        return m_Replaced.at(index);
+        return BytesOf(m_Replaced.at(index));
     }
-    return block.IsAlive(position) ? block.Value(position, scratch) : UnitsView();
+    return block.IsAlive(position) ? block.ValueBytes(position, scratch) : std::string_view();
+}
+
+UnitsView FastArray::Value(std::uint32_t index, KTUnits &scratch) const {
+    return UnitsOf(ValueBytes(index, scratch), scratch);
 }
 
 std::uint32_t FastArray::FindTagged(std::uint32_t tag, std::string_view key) const noexcept {
-    return m_Index.Find(tag, [&](std::uint32_t entry) { return Key(entry) == key; });
+    return m_Index.Find(tag, [&](std::uint32_t entry) { return EqualBytes(Key(entry), key); });
 }
 
 std::int64_t FastArray::Find(std::string_view key) const noexcept {
@@ -110,7 +114,7 @@ bool FastArray::List(std::uint32_t index, std::uint32_t &block, KTUnits &scratch
     entry.block = block;
     entry.hasKey = in.HasKeys();
     entry.key = in.HasKeys() ? in.Key(position) : std::string_view();
-    entry.value = in.IsReplaced(position) ? UnitsView(m_Replaced.at(index)) : in.Value(position, scratch);
+    entry.value = Value(index, scratch);
     return true;
 }
 
@@ -144,7 +148,8 @@ void FastArray::LinkEntry(std::uint32_t tag, std::uint32_t index, std::string_vi
     if (key.empty()) {
         return;
     }
-    std::uint32_t const before = m_Index.Link(tag, index, [&](std::uint32_t entry) { return Key(entry) == key; });
+    std::uint32_t const before =
+        m_Index.Link(tag, index, [&](std::uint32_t entry) { return EqualBytes(Key(entry), key); });
     if (before == KeyIndex::kNone) {
         return;
     }

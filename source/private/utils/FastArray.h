@@ -69,6 +69,9 @@ class FastArray final : public RefCountObj {
     /// REQUIRES: index < EntryTotal().
     UnitsView Value(std::uint32_t index, KTUnits &scratch) const;
 
+    /// The same as the bytes of its units, which may begin at an odd address: nothing is copied for that.
+    std::string_view ValueBytes(std::uint32_t index, KTUnits &scratch) const;
+
     /// The key of an entry; empty when it has none. REQUIRES: index < EntryTotal().
     std::string_view Key(std::uint32_t index) const noexcept;
 

@@ -92,7 +92,7 @@ class DictionaryBlockReader {
         }
         std::uint32_t const first = m_Array.m_EntryTotal;
         std::uint32_t const count = part.count;
-        MoveTexts();
+        SwapTexts();
         part.encoding = m_Encoding;
         part.keys = m_Keys;
         part.values = m_Values;
@@ -130,22 +130,13 @@ class DictionaryBlockReader {
         return nullptr;
     }
 
-    // Makes units of the texts: at even addresses, so that they are read where they are, and in the host's byte order.
-    // Keys and texts move one byte ahead for it, over the tables, which the records have replaced.
-    void MoveTexts() {
-        if (m_Encoding != kEncodingNone) {
+    // Makes units of the texts in the host's byte order, where they are.
+    void SwapTexts() {
+        if (m_Encoding != kEncodingNone || m_Cursor.ByteOrder() == std::endian::native) {
             return;
         }
-        if (reinterpret_cast<std::uintptr_t>(m_Values) % 2 != 0 && m_Head.entries != 0) {
-            unsigned char *const first = m_Head.hasKeys ? m_Keys : m_Values;
-            std::memmove(first - 1, first, std::size_t{m_Head.keyBytes} + m_Head.valueBytes);
-            --m_Values;
-            m_Keys = m_Head.hasKeys ? m_Keys - 1 : nullptr;
-        }
-        if (m_Cursor.ByteOrder() != std::endian::native) {
-            for (std::size_t at = 0; at + 1 < m_Head.valueBytes; at += 2) {
-                std::swap(m_Values[at], m_Values[at + 1]);
-            }
+        for (std::size_t at = 0; at + 1 < m_Head.valueBytes; at += 2) {
+            std::swap(m_Values[at], m_Values[at + 1]);
         }
     }
 
@@ -174,7 +165,7 @@ class DictionaryBlockReader {
             for (std::size_t i = 0; check && i < count; ++i) {
                 std::uint32_t const position = m_Cursor.U32At(indices + i * 4);
                 std::uint16_t const wanted = position < bucketOf.size() ? bucketOf[position] : kListed;
-                if (wanted == bucket) {
+                if (wanted == bucket && bucket < kBucketCount) { // no mark, which an entry that is not there has, too
                     bucketOf[position] = kListed;
                     --missing;
                 } else {

@@ -56,7 +56,11 @@ void ForEachField(UnitsView line, IsSeparator const &isSeparator, bool withEmpty
 // Counting first makes a row of exactly the right size.
 template <typename IsSeparator> Row Split(UnitsView line, IsSeparator const &isSeparator, bool withEmpty) {
     std::size_t count = 0;
-    ForEachField(line, isSeparator, withEmpty, [&](UnitsView) { ++count; });
+    if (withEmpty) {
+        count = 1 + static_cast<std::size_t>(std::count_if(line.begin(), line.end(), isSeparator));
+    } else {
+        ForEachField(line, isSeparator, withEmpty, [&](UnitsView) { ++count; });
+    }
     Row row;
     row.reserve(count);
     ForEachField(line, isSeparator, withEmpty,

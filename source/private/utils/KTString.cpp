@@ -312,7 +312,12 @@ KTString &KTString::assign(KTString const &text, size_type pos, size_type count)
 
 KTString &KTString::assign(unsigned short const *units) { return replace(0, npos, units); }
 
-KTString &KTString::assign(unsigned short const *units, size_type count) { return replace(0, npos, units, count); }
+KTString &KTString::assign(unsigned short const *units, size_type count) {
+    Size const added = units == nullptr ? 0 : count;
+    CheckLength(m_Units, 0, added);
+    m_Units.assign(OrEmpty(units), added);
+    return *this;
+}
 
 KTString &KTString::assign(size_type count, unsigned short unit) { return replace(0, npos, count, unit); }
 

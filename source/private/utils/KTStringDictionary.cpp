@@ -7,6 +7,8 @@
 
 #include <algorithm>
 #include <array>
+#include <cstdint>
+#include <cstring>
 #include <new>
 
 using orvik_private::DictionaryForm;
@@ -73,23 +75,40 @@ void WidenSigned(std::string_view bytes, KTString &target) {
     }
 }
 
-// The text up to its first zero.
-UnitsView UpToZero(UnitsView text) {
+// Units before the first zero.
+std::size_t CountToZero(unsigned short const *units, std::size_t count) noexcept {
     constexpr std::size_t kAtOnce = 16;
     std::size_t at = 0;
-    for (; at + kAtOnce <= text.size(); at += kAtOnce) {
+    for (; at + kAtOnce <= count; at += kAtOnce) {
         bool hasZero = false;
         for (std::size_t i = 0; i < kAtOnce; ++i) {
-            hasZero |= text[at + i] == 0;
+            hasZero |= units[at + i] == 0;
         }
         if (hasZero) {
             break;
         }
     }
-    while (at < text.size() && text[at] != 0) {
+    while (at < count && units[at] != 0) {
         ++at;
     }
-    return text.substr(0, at);
+    return at;
+}
+
+// Puts units up to the first zero among them into an empty text. At an odd address they are no units yet: they are
+// copied first.
+void PutUpToZero(std::string_view bytes, KTString &target) {
+    std::size_t const count = bytes.size() / sizeof(unsigned short);
+    if (reinterpret_cast<std::uintptr_t>(bytes.data()) % sizeof(unsigned short) == 0) {
+        auto const *const units = reinterpret_cast<unsigned short const *>(bytes.data());
+        target.append(units, CountToZero(units, count));
+        return;
+    }
+    target.append(count, 0);
+    std::memcpy(&target[0], bytes.data(), count * sizeof(unsigned short));
+    std::size_t const end = CountToZero(target.c_str(), count);
+    if (end < count) {
+        target.erase(end);
+    }
 }
 
 } // namespace
@@ -148,16 +167,17 @@ KTString KTStringDictionary::GetKeyValue(KTString const &key) {
     KeyBytes const bytes(key);
     orvik_private::KeyText const parts = orvik_private::SplitKeyText(bytes.Get());
     KTUnits scratch;
-    UnitsView text;
-    if (!m_Dictionary->LookupName(parts.name, scratch, text)) {
+    std::string_view text;
+    if (!m_Dictionary->LookupBytes(parts.name, scratch, text)) {
         if (!parts.name.empty() && IsPlain(parts.defaultText)) {
             WidenSigned(parts.defaultText, result);
             return result;
         }
-        m_Dictionary->Lookup(bytes.Get(), scratch, text);
+        UnitsView unescaped;
+        m_Dictionary->Lookup(bytes.Get(), scratch, unescaped);
+        text = orvik_private::BytesOf(unescaped);
     }
-    text = UpToZero(text);
-    result.append(text.data(), text.size());
+    PutUpToZero(text, result);
     return result;
 }
 

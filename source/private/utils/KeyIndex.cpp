@@ -2,7 +2,6 @@
 
 #include "KeyIndex.h"
 
-#include <bit>
 #include <cstddef>
 #include <cstring>
 #include <random>
@@ -11,30 +10,6 @@
 namespace orvik_private {
 
 namespace {
-
-// The state of SipHash: four words, mixed once for each 8 bytes and three times at the end.
-struct SipState {
-    std::uint64_t v0, v1, v2, v3;
-
-    void Round() noexcept {
-        v0 += v1;
-        v1 = std::rotl(v1, 13) ^ v0;
-        v0 = std::rotl(v0, 32);
-        v2 += v3;
-        v3 = std::rotl(v3, 16) ^ v2;
-        v0 += v3;
-        v3 = std::rotl(v3, 21) ^ v0;
-        v2 += v1;
-        v1 = std::rotl(v1, 17) ^ v2;
-        v2 = std::rotl(v2, 32);
-    }
-
-    void Mix(std::uint64_t word) noexcept {
-        v3 ^= word;
-        Round();
-        v0 ^= word;
-    }
-};
 
 std::uint64_t RandomWord() {
     std::random_device device;
@@ -49,25 +24,7 @@ std::uint64_t Room(std::uint64_t slots) noexcept { return slots / 4 * 3; }
 KeyIndex::KeyIndex() : m_Secret{RandomWord(), RandomWord()} {}
 
 std::uint32_t KeyIndex::TagOf(std::string_view key) const noexcept {
-    SipState state{m_Secret[0] ^ 0x736F6D6570736575, m_Secret[1] ^ 0x646F72616E646F6D, m_Secret[0] ^ 0x6C7967656E657261,
-                   m_Secret[1] ^ 0x7465646279746573};
-    char const *bytes = key.data();
-    std::size_t left = key.size();
-    std::uint64_t word = 0;
-    for (; left >= sizeof word; bytes += sizeof word, left -= sizeof word) {
-        std::memcpy(&word, bytes, sizeof word);
-        state.Mix(word);
-    }
-    word = std::uint64_t{key.size()} << 56;
-    for (std::size_t i = 0; i < left; ++i) {
-        word |= std::uint64_t{static_cast<unsigned char>(bytes[i])} << (8 * i);
-    }
-    state.Mix(word);
-    state.v2 ^= 0xFF;
-    for (int i = 0; i < 3; ++i) {
-        state.Round();
-    }
-    std::uint64_t const hash = state.v0 ^ state.v1 ^ state.v2 ^ state.v3;
+    std::uint64_t const hash = SipHash<1, 3>(m_Secret, key);
     return static_cast<std::uint32_t>(hash ^ hash >> 32);
 }
 

@@ -7,10 +7,11 @@
 //     u32 tag     32 bits of the key's hash; its low bits say where the search begins
 //     u32 entry   global index; 0xFFFFFFFF in an empty slot
 //
-// Keys are hashed with SipHash-1-3 (Aumasson and Bernstein, 2012) under a random secret, so no file can be made whose
-// keys all meet in one place.
+// Keys are hashed with SipHash-1-3 under a random secret, so no file can be made whose keys all meet in one place.
 
 #pragma once
+
+#include "SipHash.h"
 
 #include <cstdint>
 #include <memory>
@@ -85,7 +86,7 @@ class KeyIndex {
     std::unique_ptr<Slot[]> m_Slots;
     std::uint64_t m_Mask = 0; // slots less one; 0 when there are none
     std::uint64_t m_Count = 0;
-    std::uint64_t m_Secret[2];
+    SipSecret m_Secret;
 };
 
 } // namespace orvik_private

@@ -8,6 +8,7 @@
 #include <bit>
 #include <cstring>
 #include <string_view>
+#include <utility>
 
 using orvik_private::UnitsView;
 
@@ -51,6 +52,15 @@ bool IsWellFormed(std::string_view bytes, KTUnits const &decoded) {
     return decoded.find(kReplacement) == KTUnits::npos || OUnitsToUtf8(decoded.data(), decoded.size()) == bytes;
 }
 
+// The system refuses lines of 2 GiB: what is well-formed of one stays then.
+KTUnits FromAnsi(std::string_view bytes, KTUnits decoded) {
+    try {
+        return orvik_private::MultibyteToUnits(orvik_private::kEncodingAnsi, bytes);
+    } catch (orvik_private::TextConversionException const &) {
+        return decoded;
+    }
+}
+
 void Decode(std::string_view bytes, KTUnits &text) {
     if (IsAscii(bytes)) { // nearly every line is
         text.resize(bytes.size());
@@ -60,11 +70,7 @@ void Decode(std::string_view bytes, KTUnits &text) {
     }
     text = OUtf8ToUnits(bytes);
     if (!IsWellFormed(bytes, text)) {
-        try {
-            text = orvik_private::MultibyteToUnits(orvik_private::kEncodingAnsi, bytes);
-        } catch (orvik_private::TextConversionException const &) {
-            // The system refuses lines of 2 GiB; what is well-formed of this one stays.
-        }
+        text = FromAnsi(bytes, std::move(text));
     }
 }
 

@@ -8,6 +8,8 @@
 #include <windows.h>
 
 #include <algorithm>
+#include <string>
+#include <string_view>
 #include <utility>
 
 namespace orvik_private {
@@ -16,6 +18,37 @@ namespace {
 
 constexpr DWORD kMostAtOnce = DWORD{1} << 30; // one system call does not take all that memory can hold
 constexpr std::size_t kPending = std::size_t{1} << 16;
+constexpr std::uint64_t kWorthMapping = std::uint64_t{1} << 20;
+
+// Whether the file is on a disk that does not go away. Pages of a mapped file that cannot be had any more would end the
+// process, as those of its program would; a file on the network or on a stick is therefore read at once.
+bool IsOnFixedDisk(HANDLE file) {
+    constexpr std::wstring_view kLong = L"\\\\?\\";
+    std::wstring path(std::size_t{1} << 15, L'\0');
+    DWORD const length = GetFinalPathNameByHandleW(file, path.data(), static_cast<DWORD>(path.size()), VOLUME_NAME_DOS);
+    path.erase(std::min<std::size_t>(length, path.size()));
+    if (length == 0 || !path.starts_with(kLong) || path.size() < kLong.size() + 3 || path[kLong.size() + 1] != L':') {
+        return false; // such as \\?\UNC\server\share
+    }
+    return GetDriveTypeW(path.substr(kLong.size(), 3).c_str()) == DRIVE_FIXED;
+}
+
+struct UnmapView {
+    void operator()(void *view) const { UnmapViewOfFile(view); }
+};
+
+// A view of a file, which is open for as long as it is there: nobody writes to it meanwhile.
+class MappedFile final : public DictionaryBuffer {
+  public:
+    MappedFile(WOHandle &file, std::unique_ptr<void, UnmapView> view, std::size_t size)
+        : m_File(std::move(file)), m_View(std::move(view)) {
+        SetBytes(static_cast<unsigned char *>(m_View.get()), size);
+    }
+
+  private:
+    WOHandle m_File;
+    std::unique_ptr<void, UnmapView> m_View; // goes first
+};
 
 class FileSource final : public ByteSource {
   public:
@@ -32,6 +65,18 @@ class FileSource final : public ByteSource {
             return 0;
         }
         return got;
+    }
+
+    // Small files are read: that is as fast, and they are free again at once.
+    std::shared_ptr<DictionaryBuffer> Map() override {
+        if (m_Size < kWorthMapping || !IsOnFixedDisk(m_Handle.Get())) {
+            return nullptr;
+        }
+        WOHandle const section(CreateFileMappingW(m_Handle.Get(), nullptr, PAGE_WRITECOPY, 0, 0, nullptr));
+        std::size_t const size = static_cast<std::size_t>(m_Size);
+        std::unique_ptr<void, UnmapView> view(
+            section.IsValid() ? MapViewOfFile(section.Get(), FILE_MAP_COPY, 0, 0, size) : nullptr);
+        return view == nullptr ? nullptr : std::make_shared<MappedFile>(m_Handle, std::move(view), size);
     }
 
   private:

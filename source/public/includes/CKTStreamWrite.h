@@ -63,7 +63,10 @@ class KT_PUBLIC_API CKTStreamWrite : public IKTStream {
     void Close() override;
 
   private:
+    bool IsPlain() const;
     template <typename Value> void WriteValue(Value const &value);
+    template <typename Value> bool PutWhole(Value const &value);
+    bool PutString(KTString const &value, bool utf8, bool withCount);
     unsigned int WriteBytes(void *bytes, unsigned int count);
     int XferByteReverse(unsigned char *buffer, int count);
 
