@@ -31,7 +31,7 @@ bool NarrowAscii(unsigned short const *units, std::size_t count, char *bytes) no
 // A key as UTF-8. Keys are ASCII and short nearly always, and are looked up all the time, so such ones need no memory.
 class KeyBytes {
   public:
-    explicit KeyBytes(KTString const &key) {
+    explicit KeyBytes(KTString const &key) { // NOLINT(cppcoreguidelines-pro-type-member-init): see m_Short
         std::size_t const count = key.size();
         if (count <= m_Short.size() && NarrowAscii(key.c_str(), count, m_Short.data())) {
             m_Bytes = {m_Short.data(), count};
@@ -71,7 +71,8 @@ void WidenSigned(std::string_view bytes, KTString &target) {
     target.append(bytes.size(), 0);
     unsigned short *const units = &target[target.size() - bytes.size()];
     for (std::size_t i = 0; i < bytes.size(); ++i) {
-        units[i] = static_cast<unsigned short>(static_cast<signed char>(bytes[i]));
+        units[i] = static_cast<unsigned short>(
+            static_cast<short>(static_cast<signed char>(bytes[i]))); // NOLINT(bugprone-signed-char-misuse)
     }
 }
 
