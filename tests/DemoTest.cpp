@@ -88,6 +88,9 @@ std::wstring Quoted(std::wstring const &argument) { return L"\"" + argument + L"
 class Demo : public testing::Test {
   protected:
     Demo() {
+        // The first window of all has Wine start a program for the desktop, which would inherit the demo's end of the
+        // pipe and keep it open: it is started here, without the pipe. Every demo has a window, the timer service's.
+        GetDesktopWindow();
         static fs::path const ownTemp = fs::temp_directory_path();
         m_Work = ownTemp / testing::UnitTest::GetInstance()->current_test_info()->name();
         fs::remove_all(m_Work);
@@ -636,9 +639,6 @@ TEST_F(Demo, HelpAndWrongUsage) {
 
 // A fault while saving, in a real child of the demo: what the author keeps.
 TEST_F(Demo, CrashingWhileSavingKeepsTheWork) {
-    // The first window of all has Wine start a program for the desktop, which would inherit the demo's end of the pipe
-    // and keep it open: it is started here, without the pipe.
-    GetDesktopWindow();
     Outcome const outcome = CheckEmptyError(Run(L"--crash \"" KT_COURSE L"\""));
     EXPECT_EQ(outcome.status, 1U);
     EXPECT_TRUE(outcome.Has("Crash while saving\n  texts in project   6\n"
