@@ -37,6 +37,45 @@ int Fail(Console const &console, RunLog &log, std::string const &message) {
     return kNothing;
 }
 
+struct Course {
+    KTPath const &path;
+    CourseFolder const &folder;
+    CourseReading const &reading;
+    std::vector<TextResult *> const &languages;
+};
+
+// One capability after the other.
+void PrintReports(Console const &console, Options const &options, Course const &course, RunLog &log) {
+    std::vector<TextResult> const &results = course.reading.results;
+    ReportLimits limits;
+    if (options.all) {
+        limits.rows = limits.texts = std::numeric_limits<std::size_t>::max();
+    }
+    console.Print("Course folder: " + Printable(course.path.GetPathAsKTString()) + "\n\n");
+    console.Print(ReportTexts(results, limits));
+    console.Print(ReportCaptions(results));
+    console.Print(ReportDictionaries(results, limits));
+    console.Print(ReportProperties(course.folder, limits));
+    console.Print(ReportShares(results, limits));
+    console.Print(ReportOtherFiles(course.folder, limits));
+    console.Print(ReportAnimation(course.folder));
+    console.Print(ReportDigests(course.folder, limits));
+    console.Print(ReportTiles(course.folder, options.report.empty() ? KTPath() : DiskFullPath(options.report)));
+    {
+        CourseCopy const copy(course.path); // gone again before the run ends
+        log.Step("copied to the session folder");
+        console.Print(copy.Report(limits));
+        CourseDocument document(course.folder, results);
+        console.Print(ReportDocument(document));
+        log.Step("saved as one document, read back, compared and cloned");
+        console.Print(ReportBinaryDictionary(course.languages));
+    }
+    console.Print(ReportMail());
+    console.Print(ReportSystem(course.path));
+    console.Print(ReportChecks(results));
+    console.Print(ReportWork(course.reading));
+}
+
 int Run(Console const &console, Options const &options) {
     RunLog log;
     RunGuard const guard;
@@ -69,33 +108,7 @@ int Run(Console const &console, Options const &options) {
     LookTextsUp(languages);
     log.Step("languages loaded: " + std::to_string(languages.size()));
 
-    ReportLimits limits;
-    if (options.all) {
-        limits.rows = limits.texts = std::numeric_limits<std::size_t>::max();
-    }
-    console.Print("Course folder: " + shownPath + "\n\n");
-    console.Print(ReportTexts(results, limits));
-    console.Print(ReportCaptions(results));
-    console.Print(ReportDictionaries(results, limits));
-    console.Print(ReportProperties(folder, limits));
-    console.Print(ReportShares(results, limits));
-    console.Print(ReportOtherFiles(folder, limits));
-    console.Print(ReportAnimation(folder));
-    console.Print(ReportDigests(folder, limits));
-    console.Print(ReportTiles(folder, options.report.empty() ? KTPath() : DiskFullPath(options.report)));
-    {
-        CourseCopy const copy(path); // gone again before the run ends
-        log.Step("copied to the session folder");
-        console.Print(copy.Report(limits));
-        CourseDocument document(folder, results);
-        console.Print(ReportDocument(document));
-        log.Step("saved as one document, read back, compared and cloned");
-        console.Print(ReportBinaryDictionary(languages));
-    }
-    console.Print(ReportMail());
-    console.Print(ReportSystem(path));
-    console.Print(ReportChecks(results));
-    console.Print(ReportWork(reading));
+    PrintReports(console, options, {path, folder, reading, languages}, log);
 
     bool const anyRead = std::any_of(results.begin(), results.end(), [](auto const &result) { return result.isRead; });
     bool const onlyOthers = results.empty() && !folder.files.empty();
