@@ -237,12 +237,15 @@ TEST(ThreadSync, ManyPostersThatWaitForRoomAllGetIt) {
 }
 
 TEST(ThreadSync, AFlushDoesNotWakeThoseWhoWaitForRoom) {
-    // A poster that is still on its way to sleep may find the room without being woken. So: at least once it sleeps on.
+    // A poster that is still on its way to sleep may find the room without being woken, and a busy machine makes that way
+    // long. So: at least once it sleeps on, and every attempt gives it longer to fall asleep.
     bool hasSleptOn = false;
     for (int attempt = 0; attempt < 50 && !hasSleptOn; ++attempt) {
         BusyThread thread(kCapacity);
         Caller poster([&] { thread.syncPostMessage(kZero, 0, 0, 0, 0); }); // done as soon as it is queued
-        EXPECT_FALSE(poster.IsDoneSoon());
+        for (int i = 0; i <= attempt; ++i) {
+            EXPECT_FALSE(poster.IsDoneSoon());
+        }
         thread.flushMessageQueueAndPostMessage(kFiller, 0, 0, 0, 0);
         hasSleptOn = !poster.IsDoneSoon();
         thread.LetThroughUntil(2); // the thread takes the next message: now it is woken
