@@ -38,6 +38,6 @@ class WORegistryKey {
 };
 
 /// The text value `name` (null or "" for the unnamed one) up to its first zero, with environment variables filled in
-/// where its type says so, as long as the result has fewer than 32,767 units. False, with `text` unchanged, if it is not there, is no text, or may not be read. Throws
-/// std::bad_alloc. Any thread.
+/// where its type says so, as long as the result has fewer than 32,767 units. False, with `text` unchanged, if it is not
+/// there, is no text, or may not be read. Throws std::bad_alloc. Any thread.
 bool WOReadText(HKEY key, wchar_t const *name, KTUnits &text);
