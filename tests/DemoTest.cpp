@@ -1,6 +1,8 @@
 // DemoTest.cpp: the demo host as a user meets it: run as a child process, judged by its output and exit status.
 //
 // The child gets a temporary folder of its own, as its start empties the log there.
+//
+// Longer than other files: the sections of one output are judged with one fixture and its readers of tables.
 
 #include "KTInterProcessFileLock.h"
 

@@ -1,5 +1,7 @@
 // StreamFormatTest.cpp: the typed streams: what each operation leaves on the stream, byte by byte, in both byte orders
 // and both directions, and what it returns when the transport fails.
+//
+// Longer than other files: every operation of the reader and of the writer is held against the same golden bytes.
 
 #include "CKTStreamRead.h"
 #include "CKTStreamReadWrite.h"
