@@ -33,7 +33,7 @@ inline std::string ShortenStandardNames(std::string text) {
     static std::pair<char const *, char const *> const names[] = {
         {"std::__cxx11::basic_string<char, std::char_traits<char>, std::allocator<char> >", "std::string"},
         {"std::__cxx11::basic_string<wchar_t, std::char_traits<wchar_t>, std::allocator<wchar_t> >", "std::wstring"},
-        {"std::__cxx11::basic_string<unsigned short, KTUnitTraits, std::allocator<unsigned short> >", "KTUnits"},
+        {"std::__cxx11::basic_string<unsigned short, KTUnitTraits, KTUnitAllocator<unsigned short> >", "KTUnits"},
         {"std::basic_string_view<char, std::char_traits<char> >", "std::string_view"}};
     for (auto const &[longName, shortName] : names) {
         std::string const wanted = longName;

@@ -1,43 +1,86 @@
-// OThreadSpares.cpp: the per-thread list of spare blocks.
+// OThreadSpares.cpp: the per-thread lists of spare blocks.
 
 #include "OThreadSpares.h"
 
+#include <bit>
 #include <new>
 
 namespace {
 
-constexpr std::size_t kMostSpares = 8; // scoped locks are rarely nested deeper
+#if defined(__has_feature)
+#if __has_feature(address_sanitizer)
+#define KT_UNDER_ADDRESS_SANITIZER
+#endif
+#elif defined(__SANITIZE_ADDRESS__)
+#define KT_UNDER_ADDRESS_SANITIZER
+#endif
 
-struct SpareBlock {
-    SpareBlock *next;
-    std::size_t depth; // blocks in the list from this one on
-};
+#if defined(KT_UNDER_ADDRESS_SANITIZER)
+constexpr bool kKeepsBlocks = false;
+#else
+constexpr bool kKeepsBlocks = true;
+#endif
 
-static_assert(sizeof(SpareBlock) <= kOSpareBlockSize);
+constexpr std::size_t kSmallestBlock = 16;
+
+// The list whose blocks are the first to hold so many bytes: 0 for up to 16, 1 for up to 32 and so on.
+constexpr std::size_t ListFor(std::size_t size) {
+    return static_cast<std::size_t>(std::bit_width((size - (size == 0 ? 0 : 1)) / kSmallestBlock));
+}
+
+constexpr std::size_t BlockSize(std::size_t list) { return kSmallestBlock << list; }
+
+static_assert(ListFor(0) == 0 && ListFor(16) == 0 && ListFor(17) == 1 && ListFor(kOLargestSpareBlock) == 4);
+
+constexpr bool IsKept(std::size_t size) { return kKeepsBlocks && size <= kOLargestSpareBlock; }
 
 } // namespace
 
-void *OTakeSpareBlock() {
-    auto *const head = static_cast<SpareBlock *>(OGetThreadSpares());
-    if (head == nullptr) {
-        return ::operator new(kOSpareBlockSize);
+void *OTakeBlock(std::size_t size) {
+    if (!IsKept(size)) {
+        return ::operator new(size);
     }
-    OSetThreadSpares(head->next);
-    return head;
+    OThreadSpares *const spares = OGetThreadSpares();
+    void *const block = spares == nullptr ? nullptr : spares->Take(ListFor(size));
+    return block == nullptr ? ::operator new(BlockSize(ListFor(size))) : block;
 }
 
-void OKeepSpareBlock(void *block) noexcept {
-    auto *const next = static_cast<SpareBlock *>(OGetThreadSpares());
-    std::size_t const depth = next == nullptr ? 1 : next->depth + 1;
-    if (depth > kMostSpares || !OSetThreadSpares(::new (block) SpareBlock{next, depth})) {
+void OGiveBlock(void *block, std::size_t size) noexcept {
+    OThreadSpares *const spares = IsKept(size) ? OGetThreadSpares() : nullptr;
+    if (spares == nullptr || !spares->Keep(ListFor(size), block)) {
         ::operator delete(block);
     }
 }
 
-void OFreeSpareBlocks(void *head) noexcept {
-    for (auto *block = static_cast<SpareBlock *>(head); block != nullptr;) {
-        SpareBlock *const next = block->next;
-        ::operator delete(block);
-        block = next;
+OThreadSpares::~OThreadSpares() { Close(); }
+
+void *OThreadSpares::Take(std::size_t list) noexcept {
+    List &blocks = m_Lists[list];
+    Block *const block = blocks.first;
+    if (block != nullptr) {
+        blocks.first = block->next;
+        --blocks.count;
+    }
+    return block;
+}
+
+bool OThreadSpares::Keep(std::size_t list, void *block) noexcept {
+    List &blocks = m_Lists[list];
+    if (blocks.count >= kOMostSpareBlocks) {
+        return false;
+    }
+    blocks.first = ::new (block) Block{blocks.first};
+    ++blocks.count;
+    return true;
+}
+
+void OThreadSpares::Close() noexcept {
+    for (List &blocks : m_Lists) {
+        while (blocks.first != nullptr) {
+            Block *const block = blocks.first;
+            blocks.first = block->next;
+            ::operator delete(block);
+        }
+        blocks.count = kOMostSpareBlocks;
     }
 }

@@ -1,32 +1,73 @@
 // OThreadSpares.h: a few spare blocks of memory for each thread.
 //
-// A scoped lock owns an implementation object, so taking a lock would allocate memory each time; on an uncontended mutex
-// that costs several times what the mutex itself does. Each thread therefore keeps the blocks of its last few locks:
+// A scoped lock owns an implementation object and a text of more than seven units a block for them. Most live for a
+// moment, and the heap's call would cost several times what is done with them. Each thread therefore keeps the blocks
+// that it last gave back, in lists by size:
 //
-//     per-thread slot --> block [ next | depth ] --> block [ next | depth ] --> null
+//     per-thread slot --> OThreadSpares
+//                             lists[0]   16 bytes   first --> block --> block --> null     count 2
+//                             lists[1]   32 bytes   first --> null                         count 0
+//                             ...
+//                             lists[4]  256 bytes   first --> block --> null               count 1
 //
-// No lock is needed, as only the owning thread touches its list. A block may be taken by one thread and kept by another.
+// No lock is needed, as only the owning thread touches its lists. A block may be taken by one thread and kept by
+// another. Larger blocks come from and go to the global heap, and so does what a list has no room for. Under
+// AddressSanitizer nothing is kept, so that it sees the use of a block that was given back.
 
 #pragma once
 
 #include <cstddef>
 
-/// Size of every spare block in bytes.
-constexpr std::size_t kOSpareBlockSize = 16;
+/// Largest block in bytes that a thread keeps.
+constexpr std::size_t kOLargestSpareBlock = 256;
 
-/// A spare block of this thread, or a new one from the global heap. Throws std::bad_alloc.
-void *OTakeSpareBlock();
+/// Most blocks that a thread keeps of each size.
+constexpr unsigned kOMostSpareBlocks = 16;
 
-/// Keeps the block for this thread's next OTakeSpareBlock, or frees it when the thread has enough.
-void OKeepSpareBlock(void *block) noexcept;
+/// A block of at least `size` bytes, aligned for any standard type: a spare one of this thread, or a new one from the
+/// global heap. Throws std::bad_alloc.
+void *OTakeBlock(std::size_t size);
+
+/// Gives the block back, which OTakeBlock handed out for the same size, on this thread or another one. This thread
+/// keeps it, or frees it when it has enough. REQUIRES: block is not null.
+void OGiveBlock(void *block, std::size_t size) noexcept;
 
 // ---- for the platform file behind this header ----
 
-/// The head of this thread's list; null at first, and always where the system has no slot left.
-void *OGetThreadSpares() noexcept;
+/// One thread's spare blocks.
+class OThreadSpares {
+  public:
+    /// Keeps none.
+    OThreadSpares() noexcept = default;
 
-/// Sets the head of this thread's list. Returns false, and changes nothing, where the system has no slot left.
-bool OSetThreadSpares(void *head) noexcept;
+    OThreadSpares(OThreadSpares const &) = delete;
+    OThreadSpares &operator=(OThreadSpares const &) = delete;
 
-/// Frees a thread's whole list; the platform file calls it when the thread ends.
-void OFreeSpareBlocks(void *head) noexcept;
+    /// Frees all blocks.
+    ~OThreadSpares();
+
+    /// A kept block of the list, or null if there is none.
+    void *Take(std::size_t list) noexcept;
+
+    /// Keeps the block in the list. Returns false, and leaves it to the caller, when the list is full.
+    bool Keep(std::size_t list, void *block) noexcept;
+
+    /// Frees all blocks, and keeps none from now on: for a thread that ends.
+    void Close() noexcept;
+
+  private:
+    struct Block {
+        Block *next;
+    };
+
+    struct List {
+        Block *first = nullptr;
+        unsigned count = 0;
+    };
+
+    List m_Lists[5];
+};
+
+/// This thread's spare blocks, made at the first call; null where there is no memory or no slot left for them, and once
+/// the thread's end has begun.
+OThreadSpares *OGetThreadSpares() noexcept;

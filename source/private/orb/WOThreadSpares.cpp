@@ -1,16 +1,21 @@
-// WOThreadSpares.cpp: the spare list's slot in Windows thread-local storage.
+// WOThreadSpares.cpp: the slot of a thread's spare blocks in Windows thread-local storage.
 //
-// The system's own slot costs two nanoseconds a visit, the compiler's emulated thread_local several times that. The
-// library's entry point frees a thread's list when the thread ends.
+// The system's own slot costs a nanosecond or two a visit, the compiler's emulated thread_local several times that. The
+// first 64 slots are an array in the thread's own block, which <winternl.h> describes; they are read there, as
+// TlsGetValue would clear the last error, which must survive the copying of a text. The library's entry point frees a
+// thread's blocks when the thread ends.
 
 #include "OThreadSpares.h"
 
 #include <windows.h>
 
+#include <winternl.h>
+
+#include <new>
+
 namespace {
 
-// Until the initialiser below has run, and after the system refused a slot, the index is the invalid one: reads give
-// null then and writes fail, which the portable half takes as "no spares".
+// Until the initialiser below has run, and after the system refused a slot, the index is the invalid one.
 DWORD g_Slot = TLS_OUT_OF_INDEXES;
 
 struct SlotOwner {
@@ -18,19 +23,74 @@ struct SlotOwner {
 };
 SlotOwner const g_Owner;
 
+// Stands in the slot of a thread that ends, so that blocks which come later are not kept.
+OThreadSpares g_None;
+
+class LastErrorKeeper {
+  public:
+    LastErrorKeeper() noexcept : m_Error(GetLastError()) {}
+    ~LastErrorKeeper() { SetLastError(m_Error); }
+
+    LastErrorKeeper(LastErrorKeeper const &) = delete;
+    LastErrorKeeper &operator=(LastErrorKeeper const &) = delete;
+
+  private:
+    DWORD m_Error;
+};
+
+#if defined(__GNUC__)
+#pragma GCC diagnostic push
+// GCC 12 takes the thread's block, which lies at offset 0 of a segment, for an access through a null pointer.
+#pragma GCC diagnostic ignored "-Warray-bounds"
+#endif
+
+void *ReadSlot() noexcept {
+    if (g_Slot < TLS_MINIMUM_AVAILABLE) {
+        return NtCurrentTeb()->TlsSlots[g_Slot];
+    }
+    LastErrorKeeper const keeper;
+    return g_Slot == TLS_OUT_OF_INDEXES ? nullptr : TlsGetValue(g_Slot);
+}
+
+#if defined(__GNUC__)
+#pragma GCC diagnostic pop
+#endif
+
+bool WriteSlot(void *value) noexcept {
+    LastErrorKeeper const keeper;
+    return g_Slot != TLS_OUT_OF_INDEXES && TlsSetValue(g_Slot, value) != 0;
+}
+
+OThreadSpares *MakeThreadSpares() noexcept {
+    auto *const spares = g_Slot == TLS_OUT_OF_INDEXES ? nullptr : ::new (std::nothrow) OThreadSpares;
+    if (spares == nullptr || WriteSlot(spares)) {
+        return spares;
+    }
+    delete spares;
+    return nullptr;
+}
+
+void EndThreadSpares() noexcept {
+    auto *const spares = static_cast<OThreadSpares *>(ReadSlot());
+    WriteSlot(&g_None);
+    if (spares != &g_None) {
+        delete spares;
+    }
+}
+
 } // namespace
 
-void *OGetThreadSpares() noexcept { return g_Slot == TLS_OUT_OF_INDEXES ? nullptr : TlsGetValue(g_Slot); }
-
-bool OSetThreadSpares(void *head) noexcept { return g_Slot != TLS_OUT_OF_INDEXES && TlsSetValue(g_Slot, head) != 0; }
+OThreadSpares *OGetThreadSpares() noexcept {
+    auto *const spares = static_cast<OThreadSpares *>(ReadSlot());
+    return spares == nullptr ? MakeThreadSpares() : spares;
+}
 
 // The system calls this for every thread that ends and for the library's own unload (`process` is null then, and the
 // slot goes back; at process end everything does).
 BOOL WINAPI DllMain(HINSTANCE, DWORD reason, LPVOID process) {
     bool const unload = reason == DLL_PROCESS_DETACH && process == nullptr;
     if (reason == DLL_THREAD_DETACH || unload) {
-        OFreeSpareBlocks(OGetThreadSpares());
-        OSetThreadSpares(nullptr);
+        EndThreadSpares();
     }
     if (unload && g_Slot != TLS_OUT_OF_INDEXES) {
         TlsFree(g_Slot);

@@ -33,8 +33,8 @@ template <typename Mutex> class KTScopedLockImpl {
 
     boost::unique_lock<Mutex> &get() { return m_Lock; }
 
-    static void *operator new(std::size_t) { return OTakeSpareBlock(); }
-    static void operator delete(void *block) { OKeepSpareBlock(block); }
+    static void *operator new(std::size_t size) { return OTakeBlock(size); }
+    static void operator delete(void *block, std::size_t size) { OGiveBlock(block, size); }
 
   private:
     boost::unique_lock<Mutex> m_Lock;
@@ -47,8 +47,6 @@ class KTLockImpl : public KTScopedLockImpl<boost::mutex> {
 class KTRecursiveLockImpl : public KTScopedLockImpl<boost::recursive_mutex> {
     using KTScopedLockImpl::KTScopedLockImpl;
 };
-
-static_assert(sizeof(KTLockImpl) <= kOSpareBlockSize && sizeof(KTRecursiveLockImpl) <= kOSpareBlockSize);
 
 class KTConditionImpl {
   public:

@@ -18,6 +18,8 @@
 #pragma warning(push)
 // Private members of exported classes may have standard library types: host and library share one run-time.
 #pragma warning(disable : 4251 4275)
+// Attributes that only GCC and Clang know.
+#pragma warning(disable : 5030)
 #elif defined(__GNUC__)
 #pragma GCC diagnostic push
 // A few exported functions return constant values, as their callers expect; hosts that warn about it need not know.

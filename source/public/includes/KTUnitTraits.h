@@ -1,7 +1,11 @@
-// KTUnitTraits.h: character traits for UTF-16 code units held as unsigned short.
+// KTUnitTraits.h: what std::basic_string needs to hold UTF-16 code units as unsigned short.
 //
-// The standard only promises std::char_traits for its own character types, so the library brings the traits that
-// std::basic_string needs for its units. Units compare as unsigned numbers; there is no locale and no normalisation.
+// The standard only promises std::char_traits for its own character types, so the library brings the traits for its
+// units. Units compare as unsigned numbers; there is no locale and no normalisation.
+//
+// The memory for more units than the string holds inline (7) comes from the library, which keeps a few blocks for each
+// thread: most texts live for a moment, and a block at hand takes a fraction of the heap's time. So every text's memory
+// is taken and freed on the library's heap, whichever module does it.
 
 #pragma once
 
@@ -71,5 +75,33 @@ struct KTUnitTraits {
     static constexpr int_type not_eof(int_type value) noexcept { return value == eof() ? 0U : value; }
 };
 
+#include "KTBeginExports.h"
+
+/// Memory for units: a block of at least `size` bytes, aligned for any standard type. Free it with KTFreeUnits. Throws
+/// std::bad_alloc. Any thread.
+[[gnu::malloc, gnu::returns_nonnull]] KT_PUBLIC_API void *KTAllocateUnits(std::size_t size);
+
+/// Frees a block from KTAllocateUnits, of which `size` was asked, or keeps it for this thread's next one. The thread
+/// need not be the one that allocated it. REQUIRES: block is not null. The system's last error stays as it is.
+KT_PUBLIC_API void KTFreeUnits(void *block, std::size_t size) noexcept;
+
+#include "KTEndExports.h"
+
+/// The allocator of units over KTAllocateUnits. It has no state: any of them frees what another one allocated.
+template <typename Unit> struct KTUnitAllocator {
+    using value_type = Unit;
+
+    constexpr KTUnitAllocator() noexcept = default;
+    template <typename Other> constexpr KTUnitAllocator(KTUnitAllocator<Other> const &) noexcept {}
+
+    Unit *allocate(std::size_t count) { return static_cast<Unit *>(KTAllocateUnits(count * sizeof(Unit))); }
+    void deallocate(Unit *units, std::size_t count) noexcept { KTFreeUnits(units, count * sizeof(Unit)); }
+
+    /// The most units that an object can hold, as for the standard allocator.
+    static constexpr std::size_t max_size() noexcept { return static_cast<std::size_t>(PTRDIFF_MAX) / sizeof(Unit); }
+
+    friend constexpr bool operator==(KTUnitAllocator const &, KTUnitAllocator const &) noexcept { return true; }
+};
+
 /// A run of UTF-16 code units, always followed by a terminating zero unit. The storage behind KTString and OString.
-using KTUnits = std::basic_string<unsigned short, KTUnitTraits>;
+using KTUnits = std::basic_string<unsigned short, KTUnitTraits, KTUnitAllocator<unsigned short>>;
