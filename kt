@@ -308,7 +308,7 @@ fuzz_target() {
 # As many targets at a time as there are processors.
 command_fuzz() {
     local seconds=${1:-} target
-    [[ $seconds =~ ^[0-9]+$ ]] || fail "usage: ./kt fuzz SECONDS"
+    [[ $seconds =~ ^[1-9][0-9]*$ ]] || fail "usage: ./kt fuzz SECONDS"
     mkdir -p "$stamps"
     need_packages cmake ninja-build "${native_packages[@]}"
     configure native-fuzz
