@@ -31,7 +31,7 @@ class KTEdgeRamps {
     double m_LastRamp;
 };
 
-/// Multiplies the alpha bytes of a picture by the factors of column and row and truncates the products. They stand
-/// `alphaOffset` bytes behind the start of each pixel of 4 bytes (offset 3) or of 1 byte (offset 0).
+/// Multiplies the alpha bytes of a picture by the factors of column and row and truncates the products. A pixel has 4
+/// bytes, of which the last is its alpha, or 1 byte. Throws what KTInterpolator::Interpolate throws.
 void KTApplyEdgeRamps(unsigned char *image, std::size_t width, std::size_t height, std::size_t bytesPerPixel,
                       KTEdgeRamps const &horizontal, KTEdgeRamps const &vertical);
