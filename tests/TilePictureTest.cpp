@@ -309,6 +309,19 @@ TEST(TilePicture, HasNoGapWhenScaledAndTurned) {
     }
 }
 
+TEST(TilePicture, CoversTheCanvasFromFarOutside) {
+    // A course's picture may be a line of many pixels, scaled up: its ends are billions of pixels away then.
+    unsigned char const white = 255;
+    soft::Renderer const renderer({1, true, true, true});
+    KTLargeTexturedQuad3D large;
+    KTLoadTextureParams params(true, false, true, false, 0, 0, kKTPixelFormatAlpha8);
+    large.Load(&white, 1, 1, 1, 1, renderer, {}, params);
+    KTTransform const wide({}, {6e9F, 100, 1}, {}, 0, {1, 1, 1, 1});
+    Canvas canvas(8, 4, kOutside);
+    renderer.Draw(KTLargeRenderObject3D(large, wide).GetPrimitiveRenderModel(), canvas, Blend::Replace);
+    EXPECT_EQ(canvas, Canvas(8, 4, {255, 255, 255, 255}));
+}
+
 TEST(TilePicture, ReloadingUsesTheSameTextures) {
     soft::Renderer const renderer({16, false, true, true});
     KTLargeTexturedQuad3D large;

@@ -49,7 +49,11 @@ class Edge {
     std::int64_t m_Least;
 };
 
-int FirstPixel(std::int64_t position) { return static_cast<int>((position - kSubPixels / 2) / kSubPixels); }
+// The pixel at a position, or one before it, where a triangle may begin or end; from -1 to the canvas's size, as a quad
+// may reach far beyond.
+int PixelAt(std::int64_t position, int size) {
+    return static_cast<int>(std::clamp<std::int64_t>((position - kSubPixels / 2) / kSubPixels, -1, size));
+}
 
 // Calls paint(x, y, s, t) for every pixel of the canvas whose centre belongs to the triangle.
 template <typename Paint>
@@ -64,10 +68,10 @@ void Fill(Corner const &a, Corner const &b, Corner const &c, Canvas const &canva
     }
     auto const [left, right] = std::minmax({a.x, b.x, c.x});
     auto const [top, bottom] = std::minmax({a.y, b.y, c.y});
-    int const firstX = std::max(FirstPixel(left), 0);
-    int const lastX = std::min(FirstPixel(right), canvas.Width() - 1);
-    int const firstY = std::max(FirstPixel(top), 0);
-    int const lastY = std::min(FirstPixel(bottom), canvas.Height() - 1);
+    int const firstX = std::max(PixelAt(left, canvas.Width()), 0);
+    int const lastX = std::min(PixelAt(right, canvas.Width()), canvas.Width() - 1);
+    int const firstY = std::max(PixelAt(top, canvas.Height()), 0);
+    int const lastY = std::min(PixelAt(bottom, canvas.Height()), canvas.Height() - 1);
     double const whole = static_cast<double>(area);
     for (int y = firstY; y <= lastY; ++y) {
         std::int64_t const centerX = std::int64_t{firstX} * kSubPixels + kSubPixels / 2;
