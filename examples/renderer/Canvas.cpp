@@ -8,8 +8,8 @@
 
 #define STBI_NO_STDIO
 #define STBI_WRITE_NO_STDIO
-#include <stb/stb_image.h>
-#include <stb/stb_image_write.h>
+#include <stb_image.h>
+#include <stb_image_write.h>
 
 namespace soft {
 
