@@ -5,7 +5,7 @@
 #     lib/cmake/KTPublic/    the CMake package: find_package(KTPublic) gives KTPublic::KTPublic
 #     include/KTPublic/      the public headers
 #     share/KTPublic/        the debugger visualiser
-#     share/doc/KTPublic/    documents and licences
+#     share/doc/KTPublic/    README.md, and docs/ with the pages that it links to and the licences' texts
 
 include(CMakePackageConfigHelpers)
 
@@ -43,15 +43,16 @@ install(FILES ${CMAKE_BINARY_DIR}/KTPublicConfig.cmake ${CMAKE_BINARY_DIR}/KTPub
         DESTINATION ${kt_package_folder})
 
 install(FILES source/KTPublic.natvis DESTINATION ${CMAKE_INSTALL_DATADIR}/KTPublic)
-install(FILES docs/abi.md docs/ktdict.md docs/licences.md DESTINATION ${kt_doc_folder})
-install(FILES README.md DESTINATION ${kt_doc_folder} OPTIONAL)
+# As in the sources, so that the links between the pages lead somewhere.
+install(FILES README.md DESTINATION ${kt_doc_folder})
+install(DIRECTORY docs/ DESTINATION ${kt_doc_folder}/docs FILES_MATCHING PATTERN "*.md")
 
 # The full texts, as the packages of the parts inside and beside the DLL bring them.
 if(CMAKE_CROSSCOMPILING)
   foreach(package libboost1.81-dev libcli11-dev gcc-mingw-w64-x86-64-posix-runtime mingw-w64-x86-64-dev)
     set(copyright /usr/share/doc/${package}/copyright)
     if(EXISTS ${copyright})
-      install(FILES ${copyright} DESTINATION ${kt_doc_folder}/copyright RENAME ${package}.txt)
+      install(FILES ${copyright} DESTINATION ${kt_doc_folder}/docs/copyright RENAME ${package}.txt)
     endif()
   endforeach()
 endif()

@@ -4,7 +4,8 @@
 #           -DCONFIGURATION=... -P package.cmake
 #
 # Checked: the list of installed files; that none of them names the folder it was built in or installed to; that the
-# package's target needs nothing else; and that the consumer runs with the installed DLLs.
+# pages' links lead to pages; that the package's target needs nothing else; and that the consumer runs with the installed
+# DLLs.
 
 cmake_minimum_required(VERSION 3.25)
 set(installed ${WORK}/installed)
@@ -50,18 +51,16 @@ set(expected
     lib/cmake/KTPublic/KTPublicTargets.cmake
     lib/cmake/KTPublic/KTPublicTargets-${CONFIGURATION}.cmake
     share/KTPublic/KTPublic.natvis
-    share/doc/KTPublic/abi.md
-    share/doc/KTPublic/ktdict.md
-    share/doc/KTPublic/licences.md)
+    share/doc/KTPublic/README.md)
 file(GLOB headers RELATIVE ${SOURCE}/source/public/includes ${SOURCE}/source/public/includes/*.h)
 list(TRANSFORM headers PREPEND include/KTPublic/)
 list(APPEND expected ${headers})
-if(EXISTS ${SOURCE}/README.md)
-  list(APPEND expected share/doc/KTPublic/README.md)
-endif()
+file(GLOB pages RELATIVE ${SOURCE} ${SOURCE}/docs/*.md)
+list(TRANSFORM pages PREPEND share/doc/KTPublic/)
+list(APPEND expected ${pages})
 foreach(package libboost1.81-dev libcli11-dev gcc-mingw-w64-x86-64-posix-runtime mingw-w64-x86-64-dev)
   if(LAUNCHER AND EXISTS /usr/share/doc/${package}/copyright)
-    list(APPEND expected share/doc/KTPublic/copyright/${package}.txt)
+    list(APPEND expected share/doc/KTPublic/docs/copyright/${package}.txt)
   endif()
 endforeach()
 set(missing ${expected})
@@ -79,6 +78,34 @@ foreach(file IN LISTS found)
     message(FATAL_ERROR "${file} names a folder of this machine: ${lines}")
   endif()
 endforeach()
+
+# Links from page to page.
+set(links 0)
+foreach(page IN LISTS pages ITEMS share/doc/KTPublic/README.md)
+  file(READ ${prefix}/${page} text)
+  string(REPLACE "](" "\nlink:" text "${text}")
+  string(REGEX MATCHALL "\nlink:[^)\n]+\\)" targets "${text}")
+  foreach(target IN LISTS targets)
+    string(REGEX REPLACE "^\nlink:(.*)\\)$" "\\1" target "${target}")
+    math(EXPR links "${links} + 1")
+    get_filename_component(folder ${prefix}/${page} DIRECTORY)
+    string(REGEX REPLACE "#.*" "" file "${target}")
+    if(NOT EXISTS ${folder}/${file})
+      message(FATAL_ERROR "${page} has a link to ${file}, which is not installed")
+    endif()
+    if(target MATCHES "#(.*)")
+      string(REPLACE "-" " " heading "${CMAKE_MATCH_1}")
+      file(READ ${folder}/${file} text)
+      string(TOLOWER "${text}" text)
+      if(NOT text MATCHES "\n#+ ${heading}\n")
+        message(FATAL_ERROR "${page} has a link to ${target}, and there is no such heading")
+      endif()
+    endif()
+  endforeach()
+endforeach()
+if(links EQUAL 0)
+  message(FATAL_ERROR "found no links in ${pages}")
+endif()
 
 # ---- the consumer ----
 
