@@ -89,7 +89,7 @@ void FadePixels(unsigned char *pixels, std::size_t bytesPerPixel, double const *
 
 // The factors of the positions from `start` on; `clearStart` to `clearEnd` are 1.
 struct Span {
-    Factors factors;
+    Factors factors{};
     std::size_t count = 0;
     std::size_t clearStart = 0;
     std::size_t clearEnd = 0;
