@@ -9,7 +9,6 @@
 
 #include "KTInterpolator.h"
 #include "KTIntRect.h"
-#include "KTReal.h"
 #include "KTRect.h"
 #include "Table.h"
 
@@ -40,18 +39,12 @@ class ModeScope {
     KTInterpolationModeEnum const m_Former = KTInterpolator::GetInterpolationMode();
 };
 
-std::string Number(double number, int digits) {
-    KTString text;
-    text.AppendRealNumber(KTReal(number), digits);
-    return text.GetUTF8String();
-}
-
 // "X", "ALPHA" and "FIRST to LAST": the left edge on the stage in pixels, and the picture's columns that show there.
 std::vector<std::string> CellsOf(KTTransform const &transform, KTQuad3D const &quad, PictureSize const &size) {
     KTVector3f const corner = transform.matrix.TransformPoint(quad.bottomLeft);
     KTRect const stage(0, 0, kStageWidth, kStageHeight);
     KTRect shown(0, 0, quad.Width(), quad.Height());
-    shown.Offset(corner.x + kStageWidth / 2, 0);
+    shown.Offset(corner.x + kStageWidth / 2.0, 0);
     double const left = shown.left;
     shown = shown.Intersection(stage);
     shown.Offset(-left, 0);

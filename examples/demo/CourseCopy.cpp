@@ -28,12 +28,6 @@ KTFile FileAt(KTPath path, KTString const &name) {
     return KTFile(path);
 }
 
-std::string Number(KTUInt64 number) {
-    KTString text;
-    text.AppendUInt64(number);
-    return text.GetUTF8String();
-}
-
 // "2026-03-01 14:05", in local time.
 std::string Date(KTTime const &time) {
     int year = 0;

@@ -11,12 +11,6 @@ namespace {
 
 constexpr std::size_t kLanguages = 2;
 
-std::string Number(KTUInt64 number) {
-    KTString text;
-    text.AppendUInt64(number);
-    return text.GetUTF8String();
-}
-
 KTString FullKey(DictionaryEntry const &entry) { return KTString("$$$/") + entry.key; }
 
 } // namespace

@@ -32,11 +32,7 @@ class Steps {
         auto const begin = std::chrono::steady_clock::now();
         bool const done = step();
         double const took = std::chrono::duration<double, std::milli>(std::chrono::steady_clock::now() - begin).count();
-        KTString bytes;
-        bytes.AppendUInt64(file.GetSize());
-        KTString milliseconds;
-        milliseconds.AppendRealNumber(took, 1);
-        m_Table.AddRow({name, bytes.GetUTF8String(), milliseconds.GetUTF8String(), YesOrNo(done)});
+        m_Table.AddRow({name, Number(file.GetSize()), Number(took, 1), YesOrNo(done)});
         return done;
     }
 

@@ -14,20 +14,8 @@ namespace {
 constexpr std::size_t kNameWidth = 60;
 constexpr std::size_t kTextWidth = 52;
 
-std::string Number(KTUInt64 number) {
-    KTString text;
-    text.AppendUInt64(number);
-    return text.GetUTF8String();
-}
-
 // "1 file", "2 files".
 std::string Count(KTUInt64 number, char const *what) { return Number(number) + " " + what + (number == 1 ? "" : "s"); }
-
-std::string Seconds(double seconds) {
-    KTString text;
-    text.AppendRealNumber(KTReal(seconds), 2);
-    return text.GetUTF8String();
-}
 
 std::string Joined(std::vector<std::string> const &notes) {
     std::string text;
@@ -110,7 +98,7 @@ std::string ReportCaptions(std::vector<TextResult> const &results) {
         for (Cue const &cue : cues) {
             seconds += cue.end - cue.start;
         }
-        table.AddRow({PrintableTail(captions[i]->file.name, kNameWidth), Number(cues.size()), Seconds(seconds),
+        table.AddRow({PrintableTail(captions[i]->file.name, kNameWidth), Number(cues.size()), Number(seconds, 2),
                       PrintableCut(cues.front().text, kTextWidth)});
     }
     return "Captions\n" + table.Print() + More(captions.size(), kMostFiles, "file") + "\n";

@@ -15,12 +15,6 @@ namespace {
 
 constexpr std::size_t kCellWidth = 40;
 
-std::string Number(KTUInt64 number) {
-    KTString text;
-    text.AppendUInt64(number);
-    return text.GetUTF8String();
-}
-
 std::string VersionText() {
     KTOSVersion::Version const version = KTOSVersion::GetOSVersion();
     return Number(version.majorVersion) + "." + Number(version.minorVersion) + "." + Number(version.buildNumber) +

@@ -2,6 +2,8 @@
 
 #include "Table.h"
 
+#include "KTReal.h"
+
 #include <algorithm>
 #include <array>
 
@@ -97,6 +99,18 @@ std::string PrintableTail(KTString const &text, std::size_t width) {
         tail = tail.substr(1);
     }
     return "…" + Printable(tail);
+}
+
+std::string Number(KTUInt64 number) {
+    KTString text;
+    text.AppendUInt64(number);
+    return text.GetUTF8String();
+}
+
+std::string Number(double number, int digits) {
+    KTString text;
+    text.AppendRealNumber(KTReal(number), digits);
+    return text.GetUTF8String();
 }
 
 std::size_t DisplayWidth(KTString const &text) {

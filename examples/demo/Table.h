@@ -17,6 +17,10 @@ std::string PrintableCut(KTString const &text, std::size_t width);
 /// Printable, cut to its last `width` columns behind an ellipsis: of a long path, the end tells most.
 std::string PrintableTail(KTString const &text, std::size_t width);
 
+/// The number in decimal digits; with `digits`, so many behind the point. By the library's texts.
+std::string Number(KTUInt64 number);
+std::string Number(double number, int digits);
+
 /// Columns that the text takes in a terminal: East Asian letters and emoji take two, combining marks none.
 std::size_t DisplayWidth(KTString const &text);
 
