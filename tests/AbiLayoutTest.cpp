@@ -205,7 +205,7 @@ TEST(AbiLayoutTest, LoggersFieldsStandInOrder) {
 // The value at an offset of an object.
 template <typename T> T ValueAt(void const *object, std::size_t offset) {
     T value{};
-    std::memcpy(&value, static_cast<std::byte const *>(object) + offset, sizeof value);
+    std::memcpy(static_cast<void *>(&value), static_cast<std::byte const *>(object) + offset, sizeof value);
     return value;
 }
 

@@ -9,6 +9,7 @@
 #include "KTTileGrid.h"
 
 #include <algorithm>
+#include <cmath>
 #include <limits>
 #include <utility>
 
@@ -19,7 +20,7 @@ constexpr int kFrame = 2; // pixels that a frame adds to a side
 
 bool IsIn0To1(double value) { return value >= 0 && value <= 1; }
 
-int RoundedPixels(double value) { return static_cast<int>(value + 0.5); }
+int RoundedPixels(double value) { return static_cast<int>(std::trunc(value + 0.5)); }
 
 // The region's pixels along one axis: `length * before` pixels lie before it.
 KTTileAxis AxisOf(int imageLength, double before, double factor, int quadLength) {
