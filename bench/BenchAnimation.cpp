@@ -61,7 +61,7 @@ KTTransform WalkTo(std::vector<KTKeyframe> const &keyframes, int frame) {
     int const first = keyframes.front().frame;
     int const span = keyframes.back().frame - first;
     float const eased = KTInterpolator::Interpolate(0.0F, 1.0F, PositionBetween(frame, first, first + span));
-    int const warped = first + static_cast<int>(std::trunc(static_cast<double>(eased) * span + 0.5));
+    int const warped = first + static_cast<int>(std::trunc(eased * static_cast<float>(span) + 0.5));
     float const local = PositionBetween(warped, keyframes[start].frame, keyframes[start + 1].frame);
     KTInterpolator::SetInterpolationMode(kKTInterpolationLinear);
     KTTransform const transform =

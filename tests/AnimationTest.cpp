@@ -64,7 +64,7 @@ KTTransform WalkedTransform(std::vector<KTKeyframe> const &keyframes, int frame)
     int const span = keyframes.back().frame - first;
     float const global = Clamped(static_cast<float>(frame - first) / static_cast<float>(span));
     float const eased = KTInterpolator::Interpolate(0.0F, 1.0F, global);
-    int const warped = first + static_cast<int>(std::trunc(static_cast<double>(eased) * span + 0.5));
+    int const warped = first + static_cast<int>(std::trunc(eased * static_cast<float>(span) + 0.5));
     int const length = keyframes[k + 1].frame - keyframes[k].frame;
     float const local = Clamped(static_cast<float>(warped - keyframes[k].frame) / static_cast<float>(length));
     ScopedInterpolationMode const linear(kKTInterpolationLinear);
@@ -209,6 +209,11 @@ TEST(Animation, AllFramesOfIntDoNotOverflow) {
 // In single precision, 16,777,217 frames are 16,777,216: the product would end one frame early.
 TEST(Animation, ALongAnimationReachesItsEnd) {
     EXPECT_EQ(ValueAt(Animation({{0, 0}, {16'777'216, 1}, {16'777'217, 2}}), 16'777'217), 2.0F);
+}
+
+TEST(Animation, RoundsHalfAFrameUp) {
+    // Frame 6 of 19 is eased to four and a half, which a product with more digits than its factors would miss.
+    EXPECT_FLOAT_EQ(ValueAt(Animation({{0, 0}, {19, 19}}), 6), 5.0F);
 }
 
 TEST(Animation, CarriesNanAndInfinity) {

@@ -28,12 +28,15 @@ float PositionBetween(long long frame, long long start, long long end) {
     return std::clamp(position, 0.0F, 1.0F);
 }
 
-// The frame at the eased position of `frame` in the whole animation. The product is made in double precision, so that
-// the last frame of a long animation is reached exactly.
+// The frame at the eased position of `frame` in the whole animation. A float does not hold every frame of a long
+// animation, so the end is not left to the product.
 long long WarpedFrame(int frame, int first, int last) {
     float const eased = KTInterpolator::Interpolate(0.0F, 1.0F, PositionBetween(frame, first, last));
-    double const span = static_cast<double>(static_cast<long long>(last) - first);
-    return first + static_cast<long long>(std::trunc(static_cast<double>(eased) * span + 0.5));
+    if (eased >= 1.0F) {
+        return last;
+    }
+    float const passed = eased * static_cast<float>(static_cast<long long>(last) - first);
+    return first + static_cast<long long>(std::trunc(static_cast<double>(passed) + 0.5));
 }
 
 } // namespace

@@ -76,7 +76,7 @@ class KT_PUBLIC_API KTAnimation {
     /// the eased position in the whole animation, as a frame, rounded half up:
     ///
     ///     global = (frame - first) / (last - first)                in float, clamped to 0..1
-    ///     warped = first + int(Interpolate(0, 1, global) * (last - first) + 0.5)
+    ///     warped = first + int(Interpolate(0, 1, global) * (last - first) + 0.5)     the product in float
     ///     local  = (warped - start) / (end - start)                in float, clamped to 0..1
     ///
     /// and the transforms of the segment's two keyframes are interpolated linearly at `local`. So while easing carries
