@@ -313,6 +313,28 @@ TEST_F(Demo, MailProgramIsNamedAndNotUsed) {
     EXPECT_TRUE(without.Has("\nMail\n  not sent: No mail program is set up on this machine.\n\n")) << without.out;
 }
 
+// What the library finds, the demo must find, too, or it would send a mail: a library that has no path yet, and names and
+// paths of any length.
+TEST_F(Demo, MailProgramIsFoundAsTheLibraryFindsIt) {
+    std::wstring const clients = L"Software\\Clients\\Mail\\";
+    wchar_t before[256] = {};
+    DWORD size = sizeof before;
+    RegGetValueW(HKEY_LOCAL_MACHINE, clients.c_str(), nullptr, RRF_RT_REG_SZ, nullptr, before, &size);
+    for (std::wstring const &path : {std::wstring(), std::wstring(2000, L'x')}) {
+        std::wstring const key = clients + L"Harbour Mail";
+        auto const bytes = static_cast<DWORD>((path.size() + 1) * sizeof(wchar_t));
+        if (RegSetKeyValueW(HKEY_LOCAL_MACHINE, key.c_str(), L"DLLPath", REG_SZ, path.c_str(), bytes) !=
+            ERROR_SUCCESS) {
+            GTEST_SKIP() << "the machine's mail programs may not be changed";
+        }
+        RegSetValueW(HKEY_LOCAL_MACHINE, clients.c_str(), REG_SZ, L"Harbour Mail", 0);
+        Outcome const outcome = Run(L"\"" KT_COURSE L"\"");
+        EXPECT_TRUE(outcome.Has("\nMail\n  the course would be sent by: Harbour Mail\n\n")) << outcome.out;
+        RegSetValueW(HKEY_LOCAL_MACHINE, clients.c_str(), REG_SZ, before, 0);
+        RegDeleteKeyW(HKEY_LOCAL_MACHINE, key.c_str());
+    }
+}
+
 TEST_F(Demo, CourseSharesAreTakenApart) {
     Outcome const outcome = CheckEmptyError(Run(L"\"" KT_COURSE L"\""));
     EXPECT_EQ(outcome.Row("Server"), "Server Share Path Named in");

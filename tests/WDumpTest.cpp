@@ -12,7 +12,11 @@
 #include <boost/thread/barrier.hpp>
 #include <boost/thread/thread.hpp>
 
+#include <dbghelp.h>
+
 #include <atomic>
+#include <bit>
+#include <cstring>
 #include <map>
 #include <mutex>
 #include <regex>
@@ -163,6 +167,69 @@ TEST(DumpTest, ADumpThatCannotBeWrittenIsReported) {
     EXPECT_EQ(0U, child.ExitStatus());
 }
 
+struct WriterCall {
+    HANDLE process = nullptr;
+    DWORD id = 0;
+    MINIDUMP_TYPE type = MiniDumpWithFullMemory;
+    bool hasException = false;
+    MINIDUMP_EXCEPTION_INFORMATION exception{};
+    bool hasMore = false;
+};
+WriterCall g_WriterCall;
+DWORD g_WriterError = 0;
+
+BOOL WINAPI RecordAndFail(HANDLE process, DWORD id, HANDLE, MINIDUMP_TYPE type,
+                          MINIDUMP_EXCEPTION_INFORMATION *exception, MINIDUMP_USER_STREAM_INFORMATION *streams,
+                          MINIDUMP_CALLBACK_INFORMATION *callback) {
+    g_WriterCall = {process, id, type, exception != nullptr, {}, streams != nullptr || callback != nullptr};
+    if (exception != nullptr) {
+        g_WriterCall.exception = *exception;
+    }
+    SetLastError(g_WriterError);
+    return FALSE;
+}
+
+FARPROC WINAPI FindOwnWriter(HMODULE library, LPCSTR name) {
+    bool const isWriter = !IS_INTRESOURCE(name) && std::strcmp(name, "MiniDumpWriteDump") == 0;
+    return isWriter ? std::bit_cast<FARPROC>(&RecordAndFail) : GetProcAddress(library, name);
+}
+
+// A fresh process, in which the writer was not looked for yet.
+TEST(DumpTest, DISABLED_DumpByAFailingWriter) {
+    WImportHook const hook(L"KTPublic.dll", "GetProcAddress", &FindOwnWriter);
+    ASSERT_TRUE(hook.IsActive());
+    EXCEPTION_POINTERS pointers{};
+    for (DWORD const error : {5UL, 0UL, 0x80070070UL}) { // also one that the system gives no number of
+        SCOPED_TRACE(error);
+        for (EXCEPTION_POINTERS *const given : {static_cast<EXCEPTION_POINTERS *>(nullptr), &pointers}) {
+            LogLines log;
+            wdumps::Written written;
+            g_WriterError = error;
+            KTExceptionUtils::GenerateCrashDumpFile(given);
+            EXPECT_EQ(
+                (std::vector<std::string>{"Assert failed: MiniDumpWriteDump failed. Error: " + std::to_string(error) +
+                                          " at source/private/exceptions/WKTExceptionUtils:88"}),
+                log.Take());
+            EXPECT_EQ(GetCurrentProcess(), g_WriterCall.process);
+            EXPECT_EQ(GetCurrentProcessId(), g_WriterCall.id);
+            EXPECT_EQ(MiniDumpNormal, g_WriterCall.type);
+            EXPECT_FALSE(g_WriterCall.hasMore);
+            EXPECT_EQ(given != nullptr, g_WriterCall.hasException);
+            EXPECT_EQ(given, g_WriterCall.exception.ExceptionPointers);
+            EXPECT_EQ(given != nullptr ? GetCurrentThreadId() : 0, g_WriterCall.exception.ThreadId);
+            EXPECT_EQ(FALSE, g_WriterCall.exception.ClientPointers);
+            auto const dumps = written.Take();
+            ASSERT_EQ(1U, dumps.size());
+            EXPECT_TRUE(fs::remove(*dumps.begin())) << "it is closed";
+        }
+    }
+}
+
+TEST(DumpTest, TheWritersFailureIsReportedWithItsNumber) {
+    WChildProcess child("DumpTest.DISABLED_DumpByAFailingWriter");
+    EXPECT_EQ(0U, child.ExitStatus());
+}
+
 // ---- kept once ----
 
 std::size_t CountKept() { return wdumps::In(wdumps::Folder() / "DumpOnce").size(); }
@@ -211,6 +278,16 @@ TEST(DumpTest, TheLastDumpIsKeptOnceForEachSite) {
     fs::remove(*dumps.begin());
     KTLCException const dumpGone("reason", "source/private/utils/KTOnce", 3);
     EXPECT_FALSE(fs::exists(kept));
+
+    // Each new name counts as the last dump's, also that of one that could not be made.
+    std::ofstream(*dumps.begin()) << "a dump";
+    {
+        WImportHook const hook(L"KTPublic.dll", "CreateFileW", &RecordAndRefuse);
+        KTExceptionUtils::GenerateCrashDumpFile(nullptr);
+    }
+    KTLCException const dumpFailed("reason", "source/private/utils/KTOnce", 4);
+    EXPECT_FALSE(fs::exists(kept));
+    fs::remove(*dumps.begin());
     KTLCException::SetExtendedDebuggingEnabled(false);
 }
 

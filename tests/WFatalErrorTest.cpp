@@ -300,6 +300,33 @@ TEST(FatalErrorTest, AFaultingBackUpCallbackIsReported) {
     EXPECT_TRUE(outcome.HasLogged(kNotHandled));
 }
 
+// ---- the message box ----
+
+int WINAPI FaultInBox(HWND owner, LPCWSTR text, LPCWSTR caption, UINT type) {
+    Trace("box '" + Narrow(text) + "', '" + Narrow(caption) + "', type " + std::to_string(type) +
+          (owner == nullptr ? "" : ", owned"));
+    wfaults::Read();
+    return IDOK;
+}
+
+TEST(FatalErrorTest, DISABLED_BoxThatFaults) {
+    SetUpHost();
+    WImportHook const file(L"KTPublic.dll", "CreateFileW", &RefuseFile);
+    WImportHook const box(L"KTPublic.dll", "MessageBoxW", &FaultInBox);
+    KTExceptionUtils::HandleException(KTFatalException("first"));
+    Trace("went on");
+}
+
+// The translator is still there while the message is shown.
+TEST(FatalErrorTest, AFaultOfTheMessageBoxIsReported) {
+    Outcome const outcome = RunChild("BoxThatFaults");
+    EXPECT_EQ(0U, outcome.status);
+    EXPECT_EQ("back-up, crashed\nbox 'first', 'Quillon Veltrain', type 0\nwent on\natexit\nstatic destructor\n",
+              outcome.trace);
+    EXPECT_TRUE(outcome.HasLogged("CreateFile failed. Error: 5")); // its dump was tried
+    EXPECT_TRUE(outcome.HasLogged(kNotHandled));
+}
+
 // ---- a host's terminate handler ----
 
 TEST(FatalErrorTest, DISABLED_TerminateHandler) {

@@ -196,6 +196,15 @@ TEST_F(ProcessFiles, RunningIsById) {
     EXPECT_TRUE(Util::IsProcessRunning(4)) << "there, but not to be asked";
 }
 
+// The system takes the numbers behind an id for the id itself.
+TEST(Process, NumbersBesideAnIdAreNoProcess) {
+    KTUInt32 const self = GetCurrentProcessId();
+    for (KTUInt32 const id : {self + 1, self + 2, self + 3}) {
+        EXPECT_FALSE(Util::IsProcessRunning(id));
+        EXPECT_EQ(0U, Util::GetProcessMemoryUsage(id));
+    }
+}
+
 TEST(ProcessWindows, AreFoundByIdPathNameAndTitle) {
     EXPECT_EQ(nullptr, Util::GetTopWindowFromProcessID(GetCurrentProcessId())) << "this program shows none";
     RECT rectangle{1, 2, 3, 4};

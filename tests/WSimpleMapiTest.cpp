@@ -200,6 +200,30 @@ TEST_F(WSimpleMapiTest, AnAttachmentWithoutAValidPathKeepsTheMailBack) {
     ExpectNothingSent(kUnfit);
 }
 
+// The mail program takes texts up to their first zero: a part of the text, or another address, would go out.
+TEST_F(WSimpleMapiTest, ATextWithAZeroInsideKeepsTheMailBack) {
+    WMapiFolder const mapi(StandIns(L"both"));
+    KTString const text = FromUnits({'a', 0, 'b'});
+    mail->SetEmailSubject(text);
+    ExpectNothingSent(kUnfit);
+    mail->SetEmailSubject("subject");
+    mail->SetEmailBody(text);
+    ExpectNothingSent(kUnfit);
+    mail->SetEmailBody("");
+    mail->SetToRecipients(text);
+    ExpectNothingSent(kUnfit);
+    mail->SetToRecipients("Jane <" + text + ">");
+    ExpectNothingSent(kUnfit);
+    mail->SetToRecipients("");
+    mail->SetCCRecipients(text);
+    ExpectNothingSent(kUnfit);
+    mail->SetCCRecipients("");
+    mail->SetFileList({"C:\\" + text});
+    ExpectNothingSent(kUnfit);
+    mail->SetFileList({});
+    ExpectSuccess();
+}
+
 TEST_F(WSimpleMapiTest, EveryRefusalIsAFailure) {
     WMapiFolder const mapi(StandIns(L"both"));
     for (unsigned code = 1; code <= 26; ++code) { // MAPI_E_USER_ABORT to MAPI_E_NOT_SUPPORTED

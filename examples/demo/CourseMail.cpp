@@ -3,13 +3,27 @@
 #include "CourseMail.h"
 
 #include "KTPublicUtils.h"
+#include "KTRegistryUtils.h"
 #include "KTSendMail.h"
 #include "KTStringDictionary.h"
 #include "Table.h"
-#include "WMail.h"
 
 #include <memory>
 #include <new>
+
+namespace {
+
+// The machine's default mail program, where the library finds it too; empty if there is none.
+KTString MailProgram() {
+    KTString const programs("Software\\Clients\\Mail\\");
+    KTString name;
+    KTString library;
+    bool const isThere = KTRegistryUtils::GetSystemItem(programs, name) == kKTErrorNone && !name.empty() &&
+                         KTRegistryUtils::GetSystemItem(programs + name + "\\DLLPath", library) == kKTErrorNone;
+    return isThere ? name : KTString();
+}
+
+} // namespace
 
 std::string ReportMail() {
     KTString const program = MailProgram();

@@ -34,13 +34,15 @@ Writer const &GetWriter() noexcept {
 
 bool WLoadDumpWriter() noexcept { return GetWriter().write != nullptr; }
 
-DWORD WWriteDump(HANDLE file, EXCEPTION_POINTERS *pointers) noexcept {
+bool WWriteDump(HANDLE file, EXCEPTION_POINTERS *pointers, DWORD &error) noexcept {
     Writer const &writer = GetWriter();
     if (writer.write == nullptr) {
-        return writer.error;
+        error = writer.error;
+        return false;
     }
     MINIDUMP_EXCEPTION_INFORMATION information{GetCurrentThreadId(), pointers, FALSE};
     BOOL const isWritten = writer.write(GetCurrentProcess(), GetCurrentProcessId(), file, MiniDumpNormal,
                                         pointers == nullptr ? nullptr : &information, nullptr, nullptr);
-    return isWritten != FALSE ? ERROR_SUCCESS : GetLastError();
+    error = isWritten != FALSE ? ERROR_SUCCESS : GetLastError();
+    return isWritten != FALSE;
 }

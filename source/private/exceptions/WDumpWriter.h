@@ -9,5 +9,6 @@
 bool WLoadDumpWriter() noexcept;
 
 /// Writes a dump of this process, whose current thread raised the exception of `pointers` (null: none), to a file that
-/// is open for writing. 0, or the system's error number. Any thread, one at a time.
-DWORD WWriteDump(HANDLE file, EXCEPTION_POINTERS *pointers) noexcept;
+/// is open for writing. Whether it was written; if not, the system's error number goes to `error`, which may be 0 all the
+/// same. Any thread, one at a time.
+bool WWriteDump(HANDLE file, EXCEPTION_POINTERS *pointers, DWORD &error) noexcept;

@@ -105,8 +105,8 @@ void KTExceptionUtils::GenerateCrashDumpFile(void *pointers) {
         Report("CreateFile failed. Error: ", GetLastError(), 97);
         return;
     }
-    DWORD const error = WWriteDump(file.Get(), static_cast<_EXCEPTION_POINTERS *>(pointers));
-    if (error != ERROR_SUCCESS) {
+    DWORD error = ERROR_SUCCESS;
+    if (!WWriteDump(file.Get(), static_cast<_EXCEPTION_POINTERS *>(pointers), error)) {
         Report("MiniDumpWriteDump failed. Error: ", error, 88);
     }
 }

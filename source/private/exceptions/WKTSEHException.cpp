@@ -15,6 +15,15 @@ namespace {
 // The thread that is writing a dump; 0 for none.
 std::atomic<DWORD> g_DumpingThread = 0;
 
+// Names the calling thread there while it lives: inside the lock, or it would wipe out the next thread's name.
+class Dumping {
+  public:
+    Dumping() noexcept { g_DumpingThread = GetCurrentThreadId(); }
+    Dumping(Dumping const &) = delete;
+    Dumping &operator=(Dumping const &) = delete;
+    ~Dumping() { g_DumpingThread = 0; }
+};
+
 // One dump at a time. A fault of the dump writer itself becomes an exception of this kind, too, on the same thread: that
 // one goes without a dump, and the first is thrown as if the dump had failed.
 void WriteDump(_EXCEPTION_POINTERS *pointers) {
@@ -24,12 +33,11 @@ void WriteDump(_EXCEPTION_POINTERS *pointers) {
     try {
         static KTMutex mutex;
         KTLock const lock(mutex);
-        g_DumpingThread = GetCurrentThreadId();
+        Dumping const dumping;
         KTExceptionUtils::GenerateCrashDumpFile(pointers);
     } catch (...) {
         KTAssertFailed("The crash dump was given up", "source/private/exceptions/WKTSEHException", 34);
     }
-    g_DumpingThread = 0;
 }
 
 } // namespace

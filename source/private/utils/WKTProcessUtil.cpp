@@ -24,7 +24,16 @@ bool IsSameName(std::wstring_view a, std::wstring_view b) {
                                                         static_cast<int>(b.size()), TRUE) == CSTR_EQUAL;
 }
 
-WOHandle OpenToAsk(DWORD process) { return WOHandle(OpenProcess(PROCESS_QUERY_LIMITED_INFORMATION, FALSE, process)); }
+// None, with the system's error number, if there is no such process. The system passes over an id's last two bits, so
+// that the number next to an id opens its process.
+WOHandle OpenToAsk(DWORD process, DWORD access = 0) {
+    WOHandle opened(OpenProcess(PROCESS_QUERY_LIMITED_INFORMATION | access, FALSE, process));
+    if (opened.IsValid() && GetProcessId(opened.Get()) != process) {
+        opened.Close();
+        SetLastError(ERROR_INVALID_PARAMETER);
+    }
+    return opened;
+}
 
 // Empty if the process may not be asked.
 std::wstring ImagePath(HANDLE process) {
@@ -170,7 +179,7 @@ bool KTProcessUtil::IsProcessOpen(KTString const &imageName) {
 }
 
 bool KTProcessUtil::IsProcessRunning(KTUInt32 processId) {
-    WOHandle const process(OpenProcess(SYNCHRONIZE, FALSE, processId));
+    WOHandle const process = OpenToAsk(processId, SYNCHRONIZE);
     if (!process.IsValid()) {
         return GetLastError() == ERROR_ACCESS_DENIED; // it is there, but belongs to others
     }

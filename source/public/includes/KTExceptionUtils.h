@@ -104,7 +104,8 @@ class KT_PUBLIC_API KTExceptionUtils {
     /// reported in the log. Direct calls are not serialised: one thread at a time.
     static void GenerateCrashDumpFile(void *pointers);
 
-    /// The folder "Dump" in the session folder, created if it is missing.
+    /// The folder "Dump" in the session folder, created if it is missing; empty if this process has no session folder.
+    /// Throws std::bad_alloc.
     static KTPath GetDumpFolderPath();
 
     /// Copies the last crash dump into the folder "DumpOnce" of the dump folder, replacing a copy that is there. Nothing

@@ -47,8 +47,9 @@ class KT_PUBLIC_API KTSendMail {
 
     /// Sends the mail as it stands; it may be sent again, changed or not. kKTErrorFailed if the default mail program
     /// cannot be determined (message key "kKTMailClientError"), Outlook does not do as it is told ("kKTMailClientError",
-    /// and an assertion that names the step), or Simple MAPI is missing, refuses or is cancelled by the user
-    /// ("kKTMAPIError"). Nothing has been sent then. kKTErrorNone ("kKTNone") if the mail program has taken the mail, or
+    /// and an assertion that names the step), or Simple MAPI is missing, refuses or is cancelled by the user, or cannot be
+    /// handed the mail as it is: an attachment is no valid path, or a text has a zero inside or a character that it does
+    /// not take ("kKTMAPIError"). Nothing has been sent then. kKTErrorNone ("kKTNone") if the mail program has taken the mail, or
     /// shows it, in the case of Outlook. Throws std::bad_alloc.
     virtual KTErrorCodeEnum SendMail() = 0;
 

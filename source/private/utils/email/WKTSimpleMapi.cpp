@@ -106,7 +106,13 @@ void AddRecipients(Mail<wchar_t> &mail, ULONG kind, KTString const &list) {
     }
 }
 
+// The mail program would take such a text up to the zero only.
+bool HasZero(KTString const &text) { return text.find(static_cast<unsigned short>(0)) != KTString::npos; }
+
 std::optional<Mail<wchar_t>> MakeMail(KTSendMail::Content const &content) {
+    if (HasZero(content.to) || HasZero(content.cc) || HasZero(content.subject) || HasZero(content.body)) {
+        return std::nullopt;
+    }
     Mail<wchar_t> mail{content.subject.GetWstring(), content.body.GetWstring(), {}, {}};
     AddRecipients(mail, MAPI_TO, content.to);
     AddRecipients(mail, MAPI_CC, content.cc);

@@ -9,7 +9,7 @@ struct WKTMapiResult {
     enum class Outcome {
         Sent,         ///< the mail program has taken it
         NotSupported, ///< there is no MAPI32.DLL, or it has no MAPISendMail
-        Unfit,        ///< an attachment is no valid path, or a text does not fit the code page
+        Unfit,        ///< an attachment is no valid path, or a text has a zero inside or does not fit the code page
         Refused,      ///< the mail program did not take it, or the user cancelled
     };
 
