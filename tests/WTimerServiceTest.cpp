@@ -442,3 +442,34 @@ TEST(WTimerThread, AStructuredExceptionGoesToTheHandlerToo) {
     EXPECT_TRUE(witness.isFatal);
     KTDestroyTimerService();
 }
+
+TEST(WTimerThread, TheHandlerOfItsExceptionMayDestroyTheService) {
+    // As a host's clean-up does after a fatal error: here on the service's own thread, which nobody can wait for there.
+    class Destroying : public IKTExceptionHandler {
+      public:
+        void HandleException(KTException const &) override {
+            KTDestroyTimerService();
+            destroyed.Set();
+        }
+        Signal destroyed;
+    };
+    Destroying &destroying = *new Destroying;
+    KTExceptionUtils::GetInstance().SetHandler(destroying);
+    testThread = GetCurrentThreadId();
+    WImportHook const clock(kLibrary, "GetSystemTimeAsFileTime", ThrowingClock);
+    ASSERT_TRUE(clock.IsActive());
+    KTCreateTimerService();
+    HWND const window = FindTimerWindow();
+    toThrow = 1;
+    ASSERT_TRUE(destroying.destroyed.IsSet());
+    EXPECT_EQ(nullptr, KTTimerService::GetInstance());
+    EXPECT_TRUE(DestroyWindow(window)); // it is this thread's, so it stayed
+    KTCreateTimerService();
+    Receiver receiver;
+    KTInt64 id = 0;
+    KTCreateTimer(&receiver, 0, &id, Message(100));
+    EXPECT_EQ(1, id);
+    while (receiver.Take().empty()) {
+    }
+    KTDestroyTimerService();
+}

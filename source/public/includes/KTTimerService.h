@@ -62,7 +62,9 @@ using KTUITimerCallBack = void (*)(KTInt64 id, void *userData);
 KT_PUBLIC_API void KTCreateTimerService();
 
 /// Ends the service and waits for its thread, which takes a pass at most. All timers are dropped without firing. Does
-/// nothing if there is no service. REQUIRES: the thread that created the service; not from a UI timer's function.
+/// nothing if there is no service. REQUIRES: the thread that created the service; not from a UI timer's function. What
+/// handles an exception that ended the service's thread may call it there: then nothing is waited for, and the window
+/// stays until the thread that created it ends, as it does after a call on any other thread.
 KT_PUBLIC_API void KTDestroyTimerService();
 
 /// Creates a thread timer and stores its id in `id` (0: no service, or 50 such timers already). `thread` must live until
