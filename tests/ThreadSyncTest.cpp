@@ -161,6 +161,25 @@ TEST(ThreadSync, ALaterPosterTakesTheSlotAndItsMessageReleasesBoth) {
     thread.FinishAll();
 }
 
+TEST(ThreadSync, APosterBehindASynchronousQuitMessageKeepsBothWaiting) {
+    BusyThread thread(kJustUnderOnePercent);
+    Caller quitting([&] { thread.syncPostMessage(KT_THREAD_MSG_QUIT, 0, 0, 0, 0); });
+    thread.WaitForOccupancy(1);
+    for (std::size_t i = 0; i + 1 < kJustUnderOnePercent; ++i) {
+        thread.postMessage(kFiller, i, 0, 0, 0); // up to 20 messages; 21 are 2 percent
+    }
+    Caller later([&] { thread.syncPostMessage(kSecond, 0, 0, 0, 0); });
+    thread.WaitForOccupancy(2);
+    thread.Open();
+    thread.join(); // the quit message was handled: it is not what the slot holds
+    EXPECT_FALSE(quitting.IsDoneSoon());
+    EXPECT_FALSE(later.IsDoneSoon());
+    thread.start(); // so that they can end
+    EXPECT_TRUE(quitting.IsDone());
+    EXPECT_TRUE(later.IsDone());
+    thread.FinishAll();
+}
+
 TEST(ThreadSync, ManyPostersAreAllReleased) {
     constexpr int kPosters = 6;
     constexpr int kRounds = 500;

@@ -7,6 +7,7 @@
 #include "KTTimerService.h"
 #include "Receiver.h"
 #include "TestTimerWindow.h"
+#include "WChildProcess.h"
 #include "WHandleCount.h"
 
 #include <boost/thread/thread.hpp>
@@ -211,6 +212,9 @@ TEST_F(WTimers, TheWindowAndItsTimersEndWithTheService) {
     }
     EXPECT_TRUE(calls.killed.empty()); // they went with the window
     EXPECT_EQ(nullptr, FindTimerWindow());
+    WNDCLASSEXW description{};
+    description.cbSize = sizeof description;
+    EXPECT_EQ(0, GetClassInfoExW(GetModuleHandleW(nullptr), kClass, &description)); // nor is its class left behind
 }
 
 TEST(WTimerWindow, OfAThreadThatDoesNotDestroyTheServiceStaysButDoesNothing) {
@@ -232,6 +236,23 @@ TEST(WTimerWindow, OfAThreadThatDoesNotDestroyTheServiceStaysButDoesNothing) {
 }
 
 // ---- the system's timers ----
+
+TEST(WTimerWindow, DISABLED_TheFirstUITimers) {
+    KTCreateTimerService();
+    KTInt64 first = 0;
+    KTCreateUITimer(kNever, &first, Ignore, nullptr);
+    KTKillUITimer(first);
+    KTInt64 second = 0;
+    KTCreateUITimer(kNever, &second, Ignore, nullptr);
+    KTDestroyTimerService();
+    ExitProcess(first == 1 && second == 2 ? 42 : 1);
+}
+
+TEST(WTimerWindow, UITimersAreCountedFromOneInEveryProcess) {
+    WChildProcess child("WTimerWindow.DISABLED_TheFirstUITimers");
+    ASSERT_TRUE(child.Started());
+    EXPECT_EQ(42U, child.ExitStatus());
+}
 
 TEST_F(WTimers, AskTheSystemForATimerOfTheWindow) {
     WImportHook const timers(kLibrary, "SetTimer", SeeTimer);
