@@ -19,6 +19,9 @@
 //
 // WRONG: destroying a KTThread that timers still post to. Kill them first, or destroy the service.
 //
+// WRONG: a UI timer's function that waits for a thread (join, a synchronous post) which itself creates or kills a UI
+// timer. The function runs under the lock that the thread then waits for.
+//
 // Thread timers and single bursts are counted down by the service's own thread, which makes a pass over them about every
 // 10 milliseconds. They fire at the first pass after their interval is over, and what is over it is not carried into the
 // next period. A countdown that is set between two passes is charged with the whole time between them, so its first
