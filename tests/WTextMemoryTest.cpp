@@ -9,6 +9,7 @@
 
 #include <malloc.h>
 
+#include <atomic>
 #include <cstddef>
 #include <iterator>
 #include <set>
@@ -53,6 +54,23 @@ void FillLists() {
     }
 }
 
+// ---- the end of a thread, as a program's own thread-local texts meet it: behind the libraries' entry points ----
+
+std::atomic<DWORD> endingThread{0}; // whose end is looked at
+std::size_t blocksBeforeEnd = 0;
+std::size_t blocksAfterEnd = 0;
+
+void NTAPI OnThreadEnd(PVOID, DWORD reason, PVOID) {
+    if (reason == DLL_THREAD_DETACH && GetCurrentThreadId() == endingThread) {
+        blocksBeforeEnd = BlocksInUse();
+        FillLists();
+        blocksAfterEnd = BlocksInUse();
+    }
+}
+
+// Among the program's thread-local storage callbacks.
+[[gnu::section(".CRT$XLE"), gnu::used]] PIMAGE_TLS_CALLBACK onThreadEnd = &OnThreadEnd;
+
 } // namespace
 
 TEST(TextMemory, TheBlockGivenBackLastIsTheNextOne) {
@@ -89,6 +107,12 @@ TEST(TextMemory, BlocksGoWithTheirThread) {
         InNewThread(&FillLists);
     }
     EXPECT_LT(BlocksInUse(), before + kEach); // what one thread would leave
+}
+
+TEST(TextMemory, AThreadThatEndsKeepsNothing) {
+    InNewThread([] { endingThread = GetCurrentThreadId(); });
+    EXPECT_GT(blocksBeforeEnd, 0U); // it was seen
+    EXPECT_EQ(blocksBeforeEnd, blocksAfterEnd);
 }
 
 TEST(TextMemory, LastErrorOutlivesTexts) {
