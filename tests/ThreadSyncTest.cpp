@@ -188,6 +188,7 @@ TEST(ThreadSync, ManyPostersAreAllReleased) {
     thread.start();
     {
         std::vector<std::unique_ptr<Caller>> posters;
+        posters.reserve(kPosters);
         for (int i = 0; i < kPosters; ++i) {
             posters.push_back(std::make_unique<Caller>([&thread, i] {
                 auto const own = static_cast<KT_THREAD_MESSAGE>(200 + (i / 2)); // two posters each
@@ -244,6 +245,7 @@ TEST(ThreadSync, ManyPostersThatWaitForRoomAllGetIt) {
     constexpr int kPosters = 5;
     BusyThread thread(kCapacity);
     std::vector<std::unique_ptr<Caller>> posters;
+    posters.reserve(kPosters);
     for (int i = 0; i < kPosters; ++i) {
         posters.push_back(std::make_unique<Caller>([&thread] { thread.syncPostMessage(kFirst, 0, 0, 0, 0); }));
     }
