@@ -161,6 +161,25 @@ TEST(ThreadSync, ALaterPosterTakesTheSlotAndItsMessageReleasesBoth) {
     thread.FinishAll();
 }
 
+TEST(ThreadSync, APosterBehindASynchronousQuitMessageKeepsBothWaiting) {
+    BusyThread thread(kJustUnderOnePercent);
+    Caller quitting([&] { thread.syncPostMessage(KT_THREAD_MSG_QUIT, 0, 0, 0, 0); });
+    thread.WaitForOccupancy(1);
+    for (std::size_t i = 0; i + 1 < kJustUnderOnePercent; ++i) {
+        thread.postMessage(kFiller, i, 0, 0, 0); // up to 20 messages; 21 are 2 percent
+    }
+    Caller later([&] { thread.syncPostMessage(kSecond, 0, 0, 0, 0); });
+    thread.WaitForOccupancy(2);
+    thread.Open();
+    thread.join(); // the quit message was handled: it is not what the slot holds
+    EXPECT_FALSE(quitting.IsDoneSoon());
+    EXPECT_FALSE(later.IsDoneSoon());
+    thread.start(); // so that they can end
+    EXPECT_TRUE(quitting.IsDone());
+    EXPECT_TRUE(later.IsDone());
+    thread.FinishAll();
+}
+
 TEST(ThreadSync, ManyPostersAreAllReleased) {
     constexpr int kPosters = 6;
     constexpr int kRounds = 500;
@@ -169,6 +188,7 @@ TEST(ThreadSync, ManyPostersAreAllReleased) {
     thread.start();
     {
         std::vector<std::unique_ptr<Caller>> posters;
+        posters.reserve(kPosters);
         for (int i = 0; i < kPosters; ++i) {
             posters.push_back(std::make_unique<Caller>([&thread, i] {
                 auto const own = static_cast<KT_THREAD_MESSAGE>(200 + (i / 2)); // two posters each
@@ -225,6 +245,7 @@ TEST(ThreadSync, ManyPostersThatWaitForRoomAllGetIt) {
     constexpr int kPosters = 5;
     BusyThread thread(kCapacity);
     std::vector<std::unique_ptr<Caller>> posters;
+    posters.reserve(kPosters);
     for (int i = 0; i < kPosters; ++i) {
         posters.push_back(std::make_unique<Caller>([&thread] { thread.syncPostMessage(kFirst, 0, 0, 0, 0); }));
     }

@@ -4,6 +4,7 @@
 #include "GatedThread.h"
 #include "KTThread.h"
 
+#include <boost/thread/exceptions.hpp>
 #include <gtest/gtest.h>
 
 #include <atomic>
@@ -135,6 +136,22 @@ TEST(Thread, JoinWithoutStartReturnsAndSoDoesASecondJoin) {
     thread.start();
     thread.join();
     thread.join();
+}
+
+TEST(Thread, CannotJoinItself) {
+    GatedThread thread;
+    Signal refused;
+    thread.OnMessage([&](KTThreadMsg const &msg) {
+        if (msg.message == kWork) {
+            EXPECT_THROW(thread.join(), boost::thread_resource_error);
+            refused.Set();
+        }
+    });
+    thread.start();
+    Post(thread, 1);
+    EXPECT_TRUE(refused.IsSet());
+    thread.FinishAll(); // it goes on and can be joined
+    EXPECT_EQ(2U, thread.Messages().size());
 }
 
 TEST(Thread, GoesOnWithItsQueueWhenStartedAgainAfterItsEnd) {
@@ -325,6 +342,7 @@ TEST(Thread, AFlushingPostWakesTheWaitingThread) {
     thread.start();
     Post(thread, 1);
     ASSERT_TRUE(thread.Enters(1));
+    std::this_thread::sleep_for(kSoon); // until it surely sleeps: before, it would find the message by itself
     EXPECT_TRUE(thread.flushMessageQueueAndPostMessage(kWork, 2, 0, 0, 0));
     EXPECT_TRUE(thread.Enters(2));
     thread.FinishAll();

@@ -4,12 +4,14 @@
 #include "KTSimpleTimeKeeper.h"
 #include "KTStateMachine.h"
 #include "KTTickCount.h"
+#include "LogLines.h"
 #include "TestClock.h"
 
 #include <gtest/gtest.h>
 
 #include <chrono>
 #include <limits>
+#include <stdexcept>
 #include <string>
 #include <vector>
 
@@ -174,6 +176,25 @@ TEST_F(TimeKeeper, WithoutNameAndFunctionNothingIsReportedAndNothingIsLost) {
     EXPECT_EQ("PROFILE: Time taken by  = 0.5\n", Reports()[0]);
 }
 
+TEST_F(TimeKeeper, AReportThatTheFunctionThrowsAtIsMadeAgain) {
+    static bool refuses;
+    refuses = true;
+    KTSimpleTimeKeeper keeper("load");
+    keeper.SetDumpFunction([](std::string const &report) {
+        if (refuses) {
+            throw std::runtime_error("the disk is full");
+        }
+        Keep(report);
+    });
+    EXPECT_THROW(keeper.DoDumping(), std::runtime_error);
+    EXPECT_TRUE(Reports().empty());
+    refuses = false;
+    m_Clock.Advance(500 * kMillisecond);
+    keeper.DoDumping();
+    ASSERT_EQ(1U, Reports().size());
+    EXPECT_EQ("PROFILE: Time taken by load = 0.5\n", Reports()[0]);
+}
+
 // ---- the state machine ----
 
 TEST(StateMachine, HoldsAnyState) {
@@ -201,6 +222,14 @@ TEST(StateMachine, ValidateThrowsUnlessTheStateIsTheOneExpected) {
     EXPECT_EQ(5, machine.Get());
     machine.Set(-1);
     EXPECT_NO_THROW(view.Validate(-1)); // only lists cannot hold it
+}
+
+TEST(StateMachine, AnUnexpectedStateIsThrownAndNotLogged) {
+    LogLines log;
+    KTStateMachine const machine(5);
+    EXPECT_THROW(machine.Validate(4), KTLCException);
+    EXPECT_THROW(machine.ValidateAny(4, -1), KTLCException);
+    EXPECT_EQ(std::vector<std::string>{}, log.Take());
 }
 
 TEST(StateMachine, ValidateAnyLooksForTheStateInTheList) {

@@ -9,6 +9,7 @@
 
 #include <malloc.h>
 
+#include <atomic>
 #include <cstddef>
 #include <iterator>
 #include <set>
@@ -22,6 +23,7 @@ constexpr std::size_t kKeptSizes[] = {16, 32, 64, 128, 256};
 
 std::vector<void *> Allocate(std::size_t count, std::size_t size) {
     std::vector<void *> blocks;
+    blocks.reserve(count);
     for (std::size_t i = 0; i < count; ++i) {
         blocks.push_back(KTAllocateUnits(size));
     }
@@ -52,6 +54,23 @@ void FillLists() {
         Free(Allocate(kKept, size), size);
     }
 }
+
+// ---- the end of a thread, as a program's own thread-local texts meet it: behind the libraries' entry points ----
+
+std::atomic<DWORD> endingThread{0}; // whose end is looked at
+std::size_t blocksBeforeEnd = 0;
+std::size_t blocksAfterEnd = 0;
+
+void NTAPI OnThreadEnd(PVOID, DWORD reason, PVOID) {
+    if (reason == DLL_THREAD_DETACH && GetCurrentThreadId() == endingThread) {
+        blocksBeforeEnd = BlocksInUse();
+        FillLists();
+        blocksAfterEnd = BlocksInUse();
+    }
+}
+
+// Among the program's thread-local storage callbacks.
+[[gnu::section(".CRT$XLE"), gnu::used]] PIMAGE_TLS_CALLBACK onThreadEnd = &OnThreadEnd;
 
 } // namespace
 
@@ -89,6 +108,12 @@ TEST(TextMemory, BlocksGoWithTheirThread) {
         InNewThread(&FillLists);
     }
     EXPECT_LT(BlocksInUse(), before + kEach); // what one thread would leave
+}
+
+TEST(TextMemory, AThreadThatEndsKeepsNothing) {
+    InNewThread([] { endingThread = GetCurrentThreadId(); });
+    EXPECT_GT(blocksBeforeEnd, 0U); // it was seen
+    EXPECT_EQ(blocksBeforeEnd, blocksAfterEnd);
 }
 
 TEST(TextMemory, LastErrorOutlivesTexts) {

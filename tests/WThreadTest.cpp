@@ -3,6 +3,7 @@
 #include "GatedThread.h"
 #include "KTException.h"
 #include "KTExceptionUtils.h"
+#include "KTLocks.h"
 #include "KTSimpleTimeKeeper.h"
 #include "KTWorkerThread.h"
 #include "WChildProcess.h"
@@ -184,6 +185,18 @@ TEST(WThread, PostingAndTakingAllocateNothing) {
     thread.postMessage(KT_THREAD_MSG_QUIT, 0, 0, 0, 0);
     thread.join();
     EXPECT_EQ(thread.atFirst, thread.atLast);
+}
+
+TEST(WThread, ALockLeavesTheLastErrorAlone) {
+    KTMutex mutex;
+    KTRecursiveMutex recursiveMutex;
+    SetLastError(ERROR_DISK_FULL);
+    {
+        KTLock const lock(mutex);
+        KTRecursiveLock const recursiveLock(recursiveMutex);
+        EXPECT_EQ(static_cast<DWORD>(ERROR_DISK_FULL), GetLastError());
+    }
+    EXPECT_EQ(static_cast<DWORD>(ERROR_DISK_FULL), GetLastError());
 }
 
 TEST(WThread, AStructuredExceptionInTheHandlerGoesToTheExceptionHandler) {

@@ -7,6 +7,7 @@
 #include "KTTimerService.h"
 #include "Receiver.h"
 #include "TestTimerWindow.h"
+#include "WChildProcess.h"
 #include "WHandleCount.h"
 
 #include <boost/thread/thread.hpp>
@@ -211,6 +212,9 @@ TEST_F(WTimers, TheWindowAndItsTimersEndWithTheService) {
     }
     EXPECT_TRUE(calls.killed.empty()); // they went with the window
     EXPECT_EQ(nullptr, FindTimerWindow());
+    WNDCLASSEXW description{};
+    description.cbSize = sizeof description;
+    EXPECT_EQ(0, GetClassInfoExW(GetModuleHandleW(nullptr), kClass, &description)); // nor is its class left behind
 }
 
 TEST(WTimerWindow, OfAThreadThatDoesNotDestroyTheServiceStaysButDoesNothing) {
@@ -232,6 +236,23 @@ TEST(WTimerWindow, OfAThreadThatDoesNotDestroyTheServiceStaysButDoesNothing) {
 }
 
 // ---- the system's timers ----
+
+TEST(WTimerWindow, DISABLED_TheFirstUITimers) {
+    KTCreateTimerService();
+    KTInt64 first = 0;
+    KTCreateUITimer(kNever, &first, Ignore, nullptr);
+    KTKillUITimer(first);
+    KTInt64 second = 0;
+    KTCreateUITimer(kNever, &second, Ignore, nullptr);
+    KTDestroyTimerService();
+    ExitProcess(first == 1 && second == 2 ? 42 : 1);
+}
+
+TEST(WTimerWindow, UITimersAreCountedFromOneInEveryProcess) {
+    WChildProcess child("WTimerWindow.DISABLED_TheFirstUITimers");
+    ASSERT_TRUE(child.Started());
+    EXPECT_EQ(42U, child.ExitStatus());
+}
 
 TEST_F(WTimers, AskTheSystemForATimerOfTheWindow) {
     WImportHook const timers(kLibrary, "SetTimer", SeeTimer);
@@ -440,5 +461,36 @@ TEST(WTimerThread, AStructuredExceptionGoesToTheHandlerToo) {
     KTCreateTimer(reinterpret_cast<KTThread *>(noThread), 0, &id, Message(100));
     EXPECT_TRUE(witness.handled.IsSet());
     EXPECT_TRUE(witness.isFatal);
+    KTDestroyTimerService();
+}
+
+TEST(WTimerThread, TheHandlerOfItsExceptionMayDestroyTheService) {
+    // As a host's clean-up does after a fatal error: here on the service's own thread, which nobody can wait for there.
+    class Destroying : public IKTExceptionHandler {
+      public:
+        void HandleException(KTException const &) override {
+            KTDestroyTimerService();
+            destroyed.Set();
+        }
+        Signal destroyed;
+    };
+    Destroying &destroying = *new Destroying;
+    KTExceptionUtils::GetInstance().SetHandler(destroying);
+    testThread = GetCurrentThreadId();
+    WImportHook const clock(kLibrary, "GetSystemTimeAsFileTime", ThrowingClock);
+    ASSERT_TRUE(clock.IsActive());
+    KTCreateTimerService();
+    HWND const window = FindTimerWindow();
+    toThrow = 1;
+    ASSERT_TRUE(destroying.destroyed.IsSet());
+    EXPECT_EQ(nullptr, KTTimerService::GetInstance());
+    EXPECT_TRUE(DestroyWindow(window)); // it is this thread's, so it stayed
+    KTCreateTimerService();
+    Receiver receiver;
+    KTInt64 id = 0;
+    KTCreateTimer(&receiver, 0, &id, Message(100));
+    EXPECT_EQ(1, id);
+    while (receiver.Take().empty()) {
+    }
     KTDestroyTimerService();
 }

@@ -58,6 +58,22 @@ TEST(WorkerThread, JoinWaitsForTheEnd) {
     EXPECT_TRUE(isDone);
 }
 
+TEST(WorkerThread, CannotJoinItself) {
+    Signal isStarted;
+    bool isRefused = false;
+    Worker *self = nullptr;
+    Worker worker([&] {
+        isStarted.Wait();
+        EXPECT_THROW(self->join(), boost::thread_resource_error);
+        isRefused = true;
+    });
+    self = &worker;
+    worker.start();
+    isStarted.Set();
+    worker.join();
+    EXPECT_TRUE(isRefused);
+}
+
 TEST(WorkerThread, ASecondStartRunsTheWorkAgainAndDetachesTheFirst) {
     struct Shared { // never destroyed: nobody can wait for the end of a detached thread
         Signal begun;
@@ -107,9 +123,14 @@ TEST(WorkerThread, WorkersEqualThemselvesOnly) {
 
 TEST(Sleep, LastsForSecondsAndMilliseconds) {
     constexpr std::chrono::milliseconds kCoarse{20}; // a system's clock tick
-    EXPECT_LE(std::chrono::milliseconds(120) - kCoarse, TimeOf([] { KTSleepForDuration(0, 120); }));
-    EXPECT_LE(std::chrono::milliseconds(1050) - kCoarse, TimeOf([] { KTSleepForDuration(1, 50); }));
-    EXPECT_GT(std::chrono::minutes(1), TimeOf([] { KTSleepForDuration(0, 0); }));
+    constexpr std::chrono::seconds kFarTooLong{40};  // less than the seconds that stand for milliseconds here
+    auto const milliseconds = TimeOf([] { KTSleepForDuration(0, 120); });
+    EXPECT_LE(std::chrono::milliseconds(120) - kCoarse, milliseconds);
+    EXPECT_GT(kFarTooLong, milliseconds);
+    auto const both = TimeOf([] { KTSleepForDuration(1, 50); });
+    EXPECT_LE(std::chrono::milliseconds(1050) - kCoarse, both);
+    EXPECT_GT(kFarTooLong, both);
+    EXPECT_GT(kFarTooLong, TimeOf([] { KTSleepForDuration(0, 0); }));
 }
 
 // On Windows only threads of the library's own copy of Boost.Thread can be interrupted, and hosts have none of those.

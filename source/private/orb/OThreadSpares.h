@@ -68,6 +68,6 @@ class OThreadSpares {
     List m_Lists[5];
 };
 
-/// This thread's spare blocks, made at the first call; null where there is no memory or no slot left for them, and once
-/// the thread's end has begun.
+/// This thread's spare blocks, made at the first call; null where there is no memory or no slot left for them. Once the
+/// thread's end has begun: null, or spares that are closed.
 OThreadSpares *OGetThreadSpares() noexcept;

@@ -23,8 +23,12 @@ struct SlotOwner {
 };
 SlotOwner const g_Owner;
 
-// Stands in the slot of a thread that ends, so that blocks which come later are not kept.
-OThreadSpares g_None;
+// Stands in the slot of a thread that ends, so that blocks which come later are not kept: those of a program's own
+// thread-local texts, say. It is closed from the start, as all threads share it.
+struct NoSpares : OThreadSpares {
+    NoSpares() noexcept { Close(); }
+};
+NoSpares g_None;
 
 class LastErrorKeeper {
   public:

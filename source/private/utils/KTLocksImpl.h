@@ -33,6 +33,7 @@ template <typename Mutex> class KTScopedLockImpl {
 
     boost::unique_lock<Mutex> &get() { return m_Lock; }
 
+    // NOLINTNEXTLINE(misc-new-delete-overloads): its counterpart takes the size, too
     static void *operator new(std::size_t size) { return OTakeBlock(size); }
     static void operator delete(void *block, std::size_t size) { OGiveBlock(block, size); }
 

@@ -8,6 +8,8 @@
 #include "OClock.h"
 #include "OPause.h"
 
+#include <boost/thread/exceptions.hpp>
+
 namespace {
 
 constinit KTTimerService *service = nullptr;
@@ -38,7 +40,12 @@ KTTimerService::KTTimerService() : KTWorkerThread(kKTThreadPriorityHighest), m_W
 
 KTTimerService::~KTTimerService() {
     m_IsRunning = false;
-    join();
+    try {
+        join();
+    } catch (boost::thread_resource_error const &) { // NOLINT(bugprone-empty-catch)
+        // This is the service's thread, where an exception that ended the loop is being handled. It is detached, and what
+        // is left of it uses nothing of the service.
+    }
     m_Window.reset(); // and with it the system's timers
 }
 

@@ -114,9 +114,12 @@ class KT_PUBLIC_API KTThread {
     /// Queues a message, waiting without time limit while the queue is full (the quit message flushes it instead), and
     /// then waits without time limit until this thread has handled a message with that identifier: the first one
     /// handled from then on, even if it was posted earlier and by somebody else. With identifier 0 it returns when the
-    /// message is queued. Synchronous posters take turns: one waits to be handled while the others wait to post.
+    /// message is queued. One slot serves all synchronous posters of a thread: a later poster's identifier replaces an
+    /// earlier one's, and both are then released by the first handled message with the later identifier.
     ///
-    /// Never returns if the thread was not started or has ended. Any thread but this one.
+    /// Never returns if the thread was not started, or ends before it has handled the message that would release the
+    /// caller. So synchronous posters are to be done before the quit message is posted: one that posts behind it waits
+    /// for ever, and so does a synchronous post of the quit message then. Any thread but this one.
     void syncPostMessage(KT_THREAD_MESSAGE message, KTUInt64 param1, KTUInt64 param2, KTUInt64 param3, KTUInt64 param4);
 
     /// Discards every waiting message and queues this one as the only one. Returns true. Posters that wait for room are
@@ -136,8 +139,9 @@ class KT_PUBLIC_API KTThread {
 };
 
 /// Blocks the calling thread until the UTC time is that of the call plus `seconds` and `milliseconds`, at microsecond
-/// resolution. A step of the system clock moves the end with it. On a boost::thread, interrupting that thread ends the
-/// sleep with boost::thread_interrupted.
+/// resolution. A step of the system clock moves the end with it. Any thread. The sleep is an interruption point of the
+/// library's own copy of Boost.Thread: where host and library share one copy, interrupting the calling boost::thread ends
+/// it with boost::thread_interrupted. KTPublic.dll has a copy to itself, whose threads no host can interrupt.
 KT_PUBLIC_API void KTSleepForDuration(unsigned long seconds, unsigned long milliseconds);
 
 #include "KTEndExports.h"

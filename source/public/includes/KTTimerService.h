@@ -19,6 +19,9 @@
 //
 // WRONG: destroying a KTThread that timers still post to. Kill them first, or destroy the service.
 //
+// WRONG: a UI timer's function that waits for a thread (join, a synchronous post) which itself creates or kills a UI
+// timer. The function runs under the lock that the thread then waits for.
+//
 // Thread timers and single bursts are counted down by the service's own thread, which makes a pass over them about every
 // 10 milliseconds. They fire at the first pass after their interval is over, and what is over it is not carried into the
 // next period. A countdown that is set between two passes is charged with the whole time between them, so its first
@@ -62,7 +65,9 @@ using KTUITimerCallBack = void (*)(KTInt64 id, void *userData);
 KT_PUBLIC_API void KTCreateTimerService();
 
 /// Ends the service and waits for its thread, which takes a pass at most. All timers are dropped without firing. Does
-/// nothing if there is no service. REQUIRES: the thread that created the service; not from a UI timer's function.
+/// nothing if there is no service. REQUIRES: the thread that created the service; not from a UI timer's function. What
+/// handles an exception that ended the service's thread may call it there: then nothing is waited for, and the window
+/// stays until the thread that created it ends, as it does after a call on any other thread.
 KT_PUBLIC_API void KTDestroyTimerService();
 
 /// Creates a thread timer and stores its id in `id` (0: no service, or 50 such timers already). `thread` must live until
