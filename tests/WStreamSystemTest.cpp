@@ -43,6 +43,7 @@ struct Calls {
     long long readRoom = -1;  // bytes until reading fails; -1: it never does
     bool closeFails = false;
     bool truncateFails = false;
+    bool endIsTooFar = false; // the file has 4 GiB or more
 };
 Calls *calls = nullptr;
 
@@ -99,6 +100,10 @@ DWORD WINAPI HookedSetFilePointer(HANDLE handle, LONG distance, PLONG high, DWOR
         long long const distant =
             high == nullptr ? distance : (static_cast<long long>(*high) << 32) | static_cast<DWORD>(distance);
         calls->moves.push_back(std::to_string(distant) + " " + kMethods[method]);
+        if (calls->endIsTooFar && method == FILE_END) {
+            SetLastError(ERROR_INVALID_PARAMETER);
+            return INVALID_SET_FILE_POINTER;
+        }
     }
     return SetFilePointer(handle, distance, high, method);
 }
@@ -353,6 +358,18 @@ TEST_F(WStreamSystemTest, PositionsAboveTwoGigabytesAreFoundAgain) {
     EXPECT_EQ(transport.GetStreamState(), kKTStreamStateGood);
     EXPECT_EQ(transport.Seek(-1, kKTSeekFromBeginning), distant - 1000); // 4 GiB - 1 is not in the file
     EXPECT_EQ(transport.GetStreamState(), kKTStreamStateError);
+}
+
+TEST_F(WStreamSystemTest, NothingIsAppendedWhereTheEndIsOutOfReach) {
+    File("file", "precious");
+    m_Calls.endIsTooFar = true;
+    EXPECT_EQ(transport.Open(File("file"), 6, 0, 0), 0);
+    EXPECT_EQ(transport.GetStreamState(), kKTStreamStateClosed);
+    LogLines log;
+    EXPECT_EQ(WriteText(transport, "more"), 0U);
+    transport.Close();
+    EXPECT_EQ(Content("file"), "precious");
+    EXPECT_EQ(transport.Open(File("file"), 2, 0, 0), 1); // nobody holds it
 }
 
 // ---- a system that refuses ----

@@ -131,12 +131,16 @@ KTBool16 FileXferBytes::Open(KTFile const &file, unsigned int mode, unsigned int
         return 0;
     }
     m_SequentialReadTotal = 0;
+    m_State = kKTStreamStateGood;
     if (writes) {
         MoveHandle(0, appends ? kKTSeekFromEnd : kKTSeekFromBeginning);
     } else {
         RereadPosition();
     }
-    m_State = kKTStreamStateGood;
+    if (m_State != kKTStreamStateGood) { // the end of 4 GiB and more: what is to be appended would go to the beginning
+        FileXferBytes::Close();
+        return 0;
+    }
     return 1;
 }
 
