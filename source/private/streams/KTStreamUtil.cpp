@@ -87,7 +87,7 @@ bool AreEqual(IKTStream &first, IKTStream &second, unsigned int size) {
     while (size != 0) {
         int const wanted = static_cast<int>(std::min(size, kBlock));
         int const count = first.XferByte(blocks[0].bytes, wanted);
-        if (second.XferByte(blocks[1].bytes, wanted) != count ||
+        if (second.XferByte(blocks[1].bytes, wanted) != count || count < 0 || count > wanted || // a host's may say so
             std::memcmp(blocks[0].bytes, blocks[1].bytes, static_cast<unsigned int>(count)) != 0) {
             return false;
         }
