@@ -134,7 +134,8 @@ class KT_PUBLIC_API KTFileUtil {
     static KTString GetFileName(KTFile const &file);
     static KTString GetFileName(KTString const &path);
 
-    /// The path without its last element; with `withSeparator` not 0 it ends with a separator. Empty if there is none.
+    /// The path without its last element; with `withSeparator` not 0 it ends with a separator, so that a name may follow,
+    /// but for the current folder of a drive ("C:"), which one would make its root. Empty if there is none.
     static KTString GetPathOnly(KTFile const &file, short withSeparator);
 
     /// The path from its root on: relative paths are completed from the current folder, "." and ".." worked out, "/"
