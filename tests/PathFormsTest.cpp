@@ -168,6 +168,7 @@ TEST(PathParts, FolderWithAndWithoutSeparator) {
     EXPECT_EQ(KTFileUtil::GetPathOnly(KTFile(KTString("C:\\a\\b.c")), 1), "C:\\a\\");
     EXPECT_EQ(KTFileUtil::GetPathOnly(KTFile(KTString("C:\\b")), 1), "C:\\");
     EXPECT_EQ(KTFileUtil::GetPathOnly(KTFile(KTString("C:\\b")), 0), "C:\\");
+    EXPECT_EQ(KTFileUtil::GetPathOnly(KTFile(KTString("C:b")), 1), "C:") << "C:\\ is another folder";
     EXPECT_EQ(KTFileUtil::GetPathOnly(KTFile(KTString("b")), 1), "");
     EXPECT_EQ(KTFileUtil::GetPathOnly(KTFile(), 1), "");
 }

@@ -10,6 +10,7 @@
 #include "LogLines.h"
 #include "StreamSupport.h"
 
+#include <limits>
 #include <memory>
 #include <stdexcept>
 
@@ -339,6 +340,25 @@ TEST_F(StreamUtilTest, AStreamThatEndsEarlyIsDifferent) {
     shrunk.SetXferBytes(new ShrunkTransport(100, 5000));
     Source whole(std::string(5000, 'x'));
     EXPECT_EQ(KTStreamUtil::Compare(&shrunk, &whole.stream, KTStreamUtil::kCompareByteByByte), 0);
+}
+
+// A host's stream whose count is none.
+class LyingStream : public CKTStreamRead {
+  public:
+    explicit LyingStream(int count) : m_Count(count) { SetXferBytes(new RecordingTransport(Bytes("01 02 03 "))); }
+    using CKTStreamRead::XferByte;
+    int XferByte(unsigned char *, int) override { return m_Count; }
+
+  private:
+    int m_Count;
+};
+
+TEST_F(StreamUtilTest, CountsThatCannotBeAreDifferent) {
+    for (int const count : {-1, 4, 5000, std::numeric_limits<int>::max(), std::numeric_limits<int>::min()}) {
+        LyingStream one(count);
+        LyingStream other(count);
+        EXPECT_EQ(KTStreamUtil::Compare(&one, &other, KTStreamUtil::kCompareByteByByte), 0) << count;
+    }
 }
 
 // ---- on a temporary file ----

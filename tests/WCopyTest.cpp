@@ -37,6 +37,7 @@ BOOL WINAPI CannotRename(wchar_t const *, wchar_t const *, DWORD) {
 }
 
 int g_Renames = 0;
+DWORD g_LastRename = 0;
 
 // The first rename meets another drive; those that follow work.
 BOOL WINAPI RenameOnOneDrive(wchar_t const *from, wchar_t const *to, DWORD flags) {
@@ -44,7 +45,15 @@ BOOL WINAPI RenameOnOneDrive(wchar_t const *from, wchar_t const *to, DWORD flags
         SetLastError(ERROR_NOT_SAME_DEVICE);
         return FALSE;
     }
+    g_LastRename = flags;
     return MoveFileExW(from, to, flags);
+}
+
+int g_Copies = 0;
+
+BOOL WINAPI CountCopies(wchar_t const *from, wchar_t const *to, BOOL refuse) {
+    ++g_Copies;
+    return CopyFileW(from, to, refuse);
 }
 
 BOOL WINAPI CannotFlush(HANDLE) {
@@ -220,6 +229,77 @@ TEST_F(WCopy, MovesToAnotherDriveByCopying) {
     EXPECT_EQ(KTFileUtil::MoveFileW(KTFile(Path("b.txt")), KTFile(Path("c.txt")), true), KTFileUtil::kErrorNone);
     EXPECT_EQ(Content("c.txt"), "a");
     EXPECT_EQ(Count(""), 2);
+}
+
+// The original goes only when the copy is safe.
+TEST_F(WCopy, MovesToAnotherDriveOnlyWhatHasReachedTheDisk) {
+    KTFile const file = File("a.txt", "a");
+    KTFile const readOnly = File("r.txt", "r");
+    MakeReadOnly("r.txt");
+    File("tree\\sub\\x", "in it");
+    File("c.txt", "old");
+    {
+        WImportHook const renames(L"KTPublic.dll", "MoveFileExW", &RenameOnOneDrive);
+        WImportHook const hook(L"KTPublic.dll", "FlushFileBuffers", &CannotFlush);
+        ASSERT_TRUE(hook.IsActive());
+        for (KTFile const &from : {file, readOnly, KTFile(Path("tree"))}) {
+            g_Renames = 0;
+            EXPECT_EQ(KTFileUtil::MoveFileW(from, KTFile(Path("b"))), KTFileUtil::kErrorDiskFull) << from;
+        }
+        EXPECT_EQ(KTFileUtil::FileCopy(readOnly, KTFile(Path("c.txt")), true), KTFileUtil::kErrorDiskFull);
+    }
+    EXPECT_EQ(Content("a.txt"), "a");
+    EXPECT_EQ(Content("r.txt"), "r");
+    EXPECT_EQ(Content("tree\\sub\\x"), "in it");
+    EXPECT_EQ(Content("c.txt"), "old");
+    EXPECT_EQ(Count(""), 4);
+    WImportHook const renames(L"KTPublic.dll", "MoveFileExW", &RenameOnOneDrive);
+    g_Renames = 0;
+    EXPECT_EQ(KTFileUtil::MoveFileW(readOnly, KTFile(Path("b"))), KTFileUtil::kErrorNone);
+    EXPECT_EQ(g_LastRename, static_cast<DWORD>(MOVEFILE_WRITE_THROUGH)) << "and so has its name";
+    EXPECT_EQ(Content("b"), "r");
+    EXPECT_NE(GetFileAttributesW(Wide("b").c_str()) & FILE_ATTRIBUTE_READONLY, 0U) << "still read-only";
+    EXPECT_FALSE(readOnly.Exists());
+}
+
+TEST_F(WCopy, FoldersWithLinksDoNotMoveToAnotherDrive) {
+    File("outside\\precious.txt", "kept");
+    File("tree\\sub\\x", "in it");
+    if (!MakeLink("tree\\sub\\link", "outside")) {
+        GTEST_SKIP() << "no links to folders here";
+    }
+    WImportHook const hook(L"KTPublic.dll", "MoveFileExW", &RenameOnOneDrive);
+    g_Renames = 0;
+    EXPECT_EQ(KTFileUtil::MoveFileW(KTFile(Path("tree")), KTFile(Path("moved"))), KTFileUtil::kErrorFailed);
+    EXPECT_EQ(Content("tree\\sub\\x"), "in it");
+    EXPECT_EQ(Content("tree\\sub\\link\\precious.txt"), "kept");
+    EXPECT_EQ(Count(""), 2);
+}
+
+TEST_F(WCopy, AFolderWithANameThatIsRefusedIsNotCopied) {
+    File("tree\\a.txt", "a");
+    std::wstring const odd = L"\\\\?\\" + Wide("tree") + L"\\notes.";
+    ASSERT_TRUE(WOHandle(CreateFileW(odd.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_NEW, 0, nullptr)).IsValid());
+    EXPECT_EQ(KTFileUtil::FolderCopy(Path("tree"), Path("copy")), KTFileUtil::kErrorInvalidName);
+    EXPECT_EQ(Count(""), 1);
+    EXPECT_NE(DeleteFileW(odd.c_str()), FALSE) << "others cannot";
+}
+
+// Another name of the folder: a link, a mapped drive, the machine's own share.
+TEST_F(WCopy, AFolderIsNotCopiedIntoItselfUnderAnotherName) {
+    File("tree\\a.txt", "a");
+    File("tree\\sub\\b.txt", "b");
+    if (!MakeLink("alias", "tree")) {
+        GTEST_SKIP() << "no links to folders here";
+    }
+    WImportHook const hook(L"KTPublic.dll", "CopyFileW", &CountCopies);
+    ASSERT_TRUE(hook.IsActive());
+    g_Copies = 0;
+    EXPECT_EQ(KTFileUtil::FolderCopy(Path("tree"), Path("alias\\x")), KTFileUtil::kErrorFailed);
+    EXPECT_EQ(KTFileUtil::FolderCopy(Path("tree"), Path("alias\\sub\\x")), KTFileUtil::kErrorFailed);
+    EXPECT_LE(g_Copies, 4) << "no file twice";
+    EXPECT_EQ(Count("tree"), 2);
+    EXPECT_EQ(Count("tree\\sub"), 1);
 }
 
 TEST_F(WCopy, RenamesInTheFolder) {

@@ -74,6 +74,15 @@ TEST_F(WFolder, CreateDirectoryMakesTheFoldersOnTheWay) {
     EXPECT_NE(KTFileUtil::CreateDirectoryW(KTPath(KTString("Q:\\a\\b")), true), KTFileUtil::kErrorNone);
 }
 
+// One call for each folder on the way must not take the stack for it.
+TEST_F(WFolder, TheWayMayHaveMoreFoldersThanCallsFitTheStack) {
+    std::string path = "Q:";
+    for (int i = 0; i < 6'000; ++i) {
+        path += "\\a";
+    }
+    EXPECT_NE(KTFileUtil::CreateDirectoryW(KTPath(KTString(path.c_str())), true), KTFileUtil::kErrorNone);
+}
+
 TEST_F(WFolder, IsFolder) {
     EXPECT_TRUE(KTFileUtil::IsFolder(Folder("d")));
     EXPECT_TRUE(KTFileUtil::IsFolder(KTFile(KTString("C:\\"))));

@@ -8,6 +8,7 @@
 #include "KTFileUtil.h"
 #include "KTStreamUtil.h"
 #include "LogLines.h"
+#include "MemXferBytes.h"
 #include "StreamSupport.h"
 #include "TempFileXferBytes.h"
 #include "WChildProcess.h"
@@ -42,6 +43,7 @@ struct Calls {
     long long readRoom = -1;  // bytes until reading fails; -1: it never does
     bool closeFails = false;
     bool truncateFails = false;
+    bool endIsTooFar = false; // the file has 4 GiB or more
 };
 Calls *calls = nullptr;
 
@@ -98,6 +100,10 @@ DWORD WINAPI HookedSetFilePointer(HANDLE handle, LONG distance, PLONG high, DWOR
         long long const distant =
             high == nullptr ? distance : (static_cast<long long>(*high) << 32) | static_cast<DWORD>(distance);
         calls->moves.push_back(std::to_string(distant) + " " + kMethods[method]);
+        if (calls->endIsTooFar && method == FILE_END) {
+            SetLastError(ERROR_INVALID_PARAMETER);
+            return INVALID_SET_FILE_POINTER;
+        }
     }
     return SetFilePointer(handle, distance, high, method);
 }
@@ -354,6 +360,18 @@ TEST_F(WStreamSystemTest, PositionsAboveTwoGigabytesAreFoundAgain) {
     EXPECT_EQ(transport.GetStreamState(), kKTStreamStateError);
 }
 
+TEST_F(WStreamSystemTest, NothingIsAppendedWhereTheEndIsOutOfReach) {
+    File("file", "precious");
+    m_Calls.endIsTooFar = true;
+    EXPECT_EQ(transport.Open(File("file"), 6, 0, 0), 0);
+    EXPECT_EQ(transport.GetStreamState(), kKTStreamStateClosed);
+    LogLines log;
+    EXPECT_EQ(WriteText(transport, "more"), 0U);
+    transport.Close();
+    EXPECT_EQ(Content("file"), "precious");
+    EXPECT_EQ(transport.Open(File("file"), 2, 0, 0), 1); // nobody holds it
+}
+
 // ---- a system that refuses ----
 
 TEST_F(WStreamSystemTest, AFullDiskIsAnErrorAndAShortCount) {
@@ -510,6 +528,50 @@ TEST_F(WStreamSystemTest, TextThatNeedsMemoryIsReportedNotThrown) {
                                                     "source/private/streams/CKTStreamRead:92",
                                                     "Assert failed: CKTStreamWrite::XferString - out of memory at "
                                                     "source/private/streams/CKTStreamWrite:84"}));
+}
+
+void *NoNew(std::size_t) { throw std::bad_alloc(); }
+
+TEST_F(WStreamSystemTest, OpeningWithoutMemoryFailsAndThrowsNothing) {
+    std::string const name = Path(std::string(1500, 'x')).string(); // too long for a name, and for every small block
+    KTFile const other{KTString(name.c_str())};
+    Open(File("file", ""), 2);
+    WriteText(transport, "kept");
+    for (int i = 0; i < 2; ++i) { // at first the name needs memory, then the call of the system
+        if (i != 0) {
+            EXPECT_EQ(transport.Open(other, 2, 0, 0), 0);
+        }
+        WImportHook const one(kLibrary, "_Znwy", &ThrowingNew);
+        ASSERT_TRUE(one.IsActive());
+        KTBool16 opened = 1;
+        EXPECT_NO_THROW(opened = transport.Open(other, 2, 0, 0));
+        EXPECT_EQ(opened, 0);
+        EXPECT_EQ(transport.GetStreamState(), kKTStreamStateClosed);
+        EXPECT_EQ(Content("file"), "kept");
+    }
+}
+
+TEST_F(WStreamSystemTest, RefusedWritesAndReportsNeedNoMemory) {
+    MemXferBytes memory;
+    std::string bytes(262144, 'x');
+    memory.Write(bytes.data(), 262144);
+    FileXferBytes unopened;
+    CKTStreamRead reader;
+    reader.SetXferBytes(new RecordingTransport(std::vector<unsigned char>(2, 2)));
+    CKTStreamWrite writer;
+    writer.SetXferBytes(new RecordingTransport(std::vector<unsigned char>(100, 0)));
+    KTBool16 flag = 2;
+    char byte = 0;
+    WImportHook const one(kLibrary, "_Znwy", &NoNew);
+    WImportHook const many(kLibrary, "_Znay", &NoNew);
+    ASSERT_TRUE(one.IsActive() || many.IsActive());
+    EXPECT_NO_THROW(EXPECT_EQ(memory.Write(&byte, 1), 0U));
+    EXPECT_NO_THROW(EXPECT_EQ(unopened.Read(&byte, 1), 0U));
+    EXPECT_NO_THROW(EXPECT_EQ(unopened.Write(&byte, 1), 0U));
+    EXPECT_NO_THROW(unopened.Close());
+    EXPECT_NO_THROW(EXPECT_EQ(reader.XferBool(flag), 0x0202));
+    EXPECT_NO_THROW(EXPECT_EQ(writer.XferBool(flag), 1));
+    EXPECT_NO_THROW(EXPECT_EQ(KTStreamUtil::StreamCopy(nullptr, nullptr), kKTErrorFailed));
 }
 
 int buffers = 0;

@@ -29,7 +29,12 @@ bool Ends(KTString const &text, char const *end) {
     return text.size() >= wanted.size() && text.substr(text.size() - wanted.size()) == wanted;
 }
 
-DWORD WINAPI NoName(HMODULE, wchar_t *, DWORD) { return 0; }
+DWORD g_NameSize = 0;
+
+DWORD WINAPI NoName(HMODULE, wchar_t *, DWORD size) {
+    g_NameSize = size;
+    return 0;
+}
 
 std::vector<std::wstring> g_Opened;
 int g_Refusals = 0;
@@ -225,6 +230,7 @@ TEST_F(WUniqueName, AnUnknownExecutableIsReported) {
     ASSERT_TRUE(hook.IsActive());
     LogLines log;
     EXPECT_EQ(KTFileUtil::GetCurrentExecutablePath(), KTPath());
+    EXPECT_EQ(g_NameSize, 32'767U);
     EXPECT_EQ(log.Take(), std::vector<std::string>{"Assert failed:  at source/private/utils/WKTFileUtil:88"});
     EXPECT_EQ(KTFileUtil::GetResourcesFolderPath(), KTPath());
 }

@@ -103,7 +103,7 @@ class WFileFixture : public testing::Test {
     static bool IsWine() { return FindUnixName() != nullptr; }
 
     /// Makes a link to a folder or a file: by the system's call, or under Wine, which has no links of its own, by the system
-    /// around it. False if there is neither.
+    /// around it, in the place of one that an earlier run has left. False if there is neither.
     bool MakeLink(KTString const &name, KTString const &target, bool isFolder = true) const {
         std::filesystem::path const link = Wide(name);
         if (!IsWine()) {
@@ -113,7 +113,7 @@ class WFileFixture : public testing::Test {
         std::string const folder = FindUnixName()(Wide(target).c_str());
         std::string const place = FindUnixName()(link.parent_path().c_str());
         std::string command =
-            "cmd.exe /c start /unix /bin/ln -s \"" + folder + "\" \"" + place + "/" + link.filename().string() + "\"";
+            "cmd.exe /c start /unix /bin/ln -sfn \"" + folder + "\" \"" + place + "/" + link.filename().string() + "\"";
         STARTUPINFOA startup{};
         startup.cb = sizeof startup;
         PROCESS_INFORMATION process{};

@@ -13,9 +13,12 @@
 OError OCopyFile(OPath const &from, OPath const &to, bool replace);
 
 /// Copies a folder and all below it to a path where nothing is. Links to folders are left out, links to files become
-/// the files they lead to. On failure nothing is left at the target.
+/// the files they lead to. Failed if the target lies in the folder, whatever names lead there. On failure nothing is left
+/// at the target.
 OError OCopyFolder(OPath const &from, OPath const &to);
 
 /// Renames a file or a folder, also to another drive, where it is copied and then deleted. The target is treated as
-/// OCopyFile does. On another drive the copy stays if the original cannot be deleted, which is an error.
+/// OCopyFile does. On another drive the content is on the disk before the original is deleted; a folder with links to
+/// folders in it is not moved there, as they would be lost: Failed. The copy stays if the original cannot be deleted,
+/// which is an error.
 OError OMove(OPath const &from, OPath const &to, bool replace);

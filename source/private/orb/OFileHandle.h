@@ -33,7 +33,7 @@ struct OTransfer {
 };
 
 /// Opens a file that others may read meanwhile. `flags` are the system's flags and attributes (CreateFileW). Returns the
-/// system's invalid handle, and false from OIsOpen, if the path is not valid or the system refuses.
+/// system's invalid handle, and false from OIsOpen, if the path is not valid, memory is short, or the system refuses.
 OFileHandle OOpenFile(OPath const &path, unsigned int access, ODisposition disposition, unsigned int flags);
 bool OIsOpen(OFileHandle handle) noexcept;
 

@@ -21,6 +21,10 @@ namespace {
 constexpr int kMostAttempts = 1000;
 constexpr DWORD kShareAll = FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE;
 
+// What becomes of the original. One that is deleted lives on in the copy alone, which then has to be whole and safe on
+// the disk.
+enum class Original { Stays, IsDeleted };
+
 // A path beside the target that nobody has.
 OPath StagingPath(OPath const &fullTarget) {
     KTUnits name = {'~', 'k', 't', '-'};
@@ -53,15 +57,25 @@ OError CheckTarget(OPath const &target, bool replace, bool &exists) {
     return probe.IsValid() ? OError::None : WOLastError();
 }
 
-// The content reaches the disk before the name does, or a power failure could leave the name of an empty file.
-bool Flush(OPath const &path) {
-    WOHandle const file(
-        CreateFileW(WOLongPath(path).c_str(), GENERIC_WRITE, kShareAll, nullptr, OPEN_EXISTING, 0, nullptr));
-    return file.IsValid() && FlushFileBuffers(file.Get()) != FALSE;
+// Sends the content of a copy to the disk. A read-only one cannot be opened for this, so it is writable meanwhile.
+OError Flush(WOLongPath const &name) {
+    DWORD const attributes = GetFileAttributesW(name.c_str());
+    bool const isReadOnly = attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_READONLY) != 0;
+    if (isReadOnly && SetFileAttributesW(name.c_str(), attributes & ~DWORD{FILE_ATTRIBUTE_READONLY}) == FALSE) {
+        return WOLastError();
+    }
+    WOHandle file(CreateFileW(name.c_str(), GENERIC_WRITE, kShareAll, nullptr, OPEN_EXISTING, 0, nullptr));
+    OError error = file.IsValid() && FlushFileBuffers(file.Get()) != FALSE ? OError::None : WOLastError();
+    file.Close();
+    if (isReadOnly && SetFileAttributesW(name.c_str(), attributes) == FALSE && error == OError::None) {
+        error = WOLastError();
+    }
+    return error;
 }
 
-OError Rename(OPath const &from, OPath const &to, bool replace) {
-    DWORD const flags = replace ? MOVEFILE_REPLACE_EXISTING : 0;
+OError Rename(OPath const &from, OPath const &to, bool replace, Original original) {
+    DWORD const flags = (replace ? MOVEFILE_REPLACE_EXISTING : 0) |
+                        (original == Original::IsDeleted ? MOVEFILE_WRITE_THROUGH : 0); // the name, too, is on the disk
     return MoveFileExW(WOLongPath(from).c_str(), WOLongPath(to).c_str(), flags) != FALSE ? OError::None : WOLastError();
 }
 
@@ -99,13 +113,30 @@ bool IsBelow(OPath const &inner, OPath const &outer) {
     return false;
 }
 
-// Copies what is in one folder into another, which is empty.
-OError CopyContent(OPath const &source, OPath const &target) {
+OError CopyOneFile(OPath const &from, OPath const &to, Original original) {
+    WOLongPath const source(from);
+    WOLongPath const name(to);
+    if (!source.IsValid() || !name.IsValid()) {
+        return OError::InvalidName; // others may have given it: with a dot at its end, for one
+    }
+    if (CopyFileW(source.c_str(), name.c_str(), TRUE) == FALSE) {
+        return WOLastError();
+    }
+    return original == Original::IsDeleted ? Flush(name) : OError::None;
+}
+
+// Copies what is in one folder into another, which is empty and has a name that nothing else has.
+OError CopyContent(OPath const &source, OPath const &target, Original original) {
+    OString const targetName = target.GetFileName();
     std::vector<std::pair<OPath, OPath>> pending = {{source, target}};
     while (!pending.empty()) {
         auto const [from, to] = std::move(pending.back());
         pending.pop_back();
-        WOFind find(WOLongPath(from).c_str());
+        WOLongPath const folder(from);
+        if (!folder.IsValid()) {
+            return OError::InvalidName; // too long a way
+        }
+        WOFind find(folder.c_str());
         while (find.Next()) {
             OString const name(OWideToUnits(find.Name(), OWideLength(find.Name())));
             OPath fromEntry(from);
@@ -113,14 +144,20 @@ OError CopyContent(OPath const &source, OPath const &target) {
             fromEntry.Append(name);
             toEntry.Append(name);
             if (find.IsFolder() && find.IsLink()) {
+                if (original == Original::IsDeleted) {
+                    return OError::Failed; // the link would be lost
+                }
                 continue;
+            }
+            if (name == targetName) {
+                return OError::Failed; // the copy itself: its path leads here, a link or a mapped drive on the way
             }
             OError error = OError::None;
             if (find.IsFolder()) {
                 error = OMakeFolder(toEntry, false);
                 pending.emplace_back(std::move(fromEntry), std::move(toEntry));
-            } else if (CopyFileW(WOLongPath(fromEntry).c_str(), WOLongPath(toEntry).c_str(), TRUE) == FALSE) {
-                error = WOLastError();
+            } else {
+                error = CopyOneFile(fromEntry, toEntry, original);
             }
             if (error != OError::None) {
                 return error;
@@ -133,18 +170,7 @@ OError CopyContent(OPath const &source, OPath const &target) {
     return OError::None;
 }
 
-// Rename could not do it: copy, then delete the original.
-OError MoveToOtherDrive(OPath const &from, OPath const &to, bool isFolder, bool replace) {
-    OError const copied = isFolder ? OCopyFolder(from, to) : OCopyFile(from, to, replace);
-    if (copied != OError::None) {
-        return copied;
-    }
-    return isFolder ? ODeleteFolder(from) : ODelete(from);
-}
-
-} // namespace
-
-OError OCopyFile(OPath const &from, OPath const &to, bool replace) {
+OError CopyFileTo(OPath const &from, OPath const &to, bool replace, Original original) {
     OFileFacts facts;
     OError error = OGetFacts(from, facts);
     if (error == OError::None && facts.isFolder) {
@@ -163,12 +189,12 @@ OError OCopyFile(OPath const &from, OPath const &to, bool replace) {
     if (error != OError::None) {
         return error;
     }
-    // A read-only copy cannot be opened for this; there the system's own order of writing has to do.
-    if (exists && !facts.isReadOnly && !Flush(staging)) {
-        error = WOLastError();
+    // The content reaches the disk before the name does, or a power failure could leave the name of an empty file.
+    if (exists || original == Original::IsDeleted) {
+        error = Flush(WOLongPath(staging));
     }
     if (error == OError::None) {
-        error = Rename(staging, target, replace);
+        error = Rename(staging, target, replace, original);
     }
     if (error != OError::None) {
         ODelete(staging);
@@ -176,7 +202,7 @@ OError OCopyFile(OPath const &from, OPath const &to, bool replace) {
     return error;
 }
 
-OError OCopyFolder(OPath const &from, OPath const &to) {
+OError CopyFolderTo(OPath const &from, OPath const &to, Original original) {
     OPath const source = OGetFullPath(from);
     OPath const target = OGetFullPath(to);
     OFileFacts facts;
@@ -201,15 +227,33 @@ OError OCopyFolder(OPath const &from, OPath const &to) {
     if (copied != OError::None) {
         return copied;
     }
-    copied = CopyContent(source, staging);
+    copied = CopyContent(source, staging, original);
     if (copied == OError::None) {
-        copied = Rename(staging, target, false);
+        copied = Rename(staging, target, false, original);
     }
     if (copied != OError::None) {
         ODeleteFolder(staging);
     }
     return copied;
 }
+
+// Rename could not do it: copy, then delete the original.
+OError MoveToOtherDrive(OPath const &from, OPath const &to, bool isFolder, bool replace) {
+    OError const copied =
+        isFolder ? CopyFolderTo(from, to, Original::IsDeleted) : CopyFileTo(from, to, replace, Original::IsDeleted);
+    if (copied != OError::None) {
+        return copied;
+    }
+    return isFolder ? ODeleteFolder(from) : ODelete(from);
+}
+
+} // namespace
+
+OError OCopyFile(OPath const &from, OPath const &to, bool replace) {
+    return CopyFileTo(from, to, replace, Original::Stays);
+}
+
+OError OCopyFolder(OPath const &from, OPath const &to) { return CopyFolderTo(from, to, Original::Stays); }
 
 OError OMove(OPath const &from, OPath const &to, bool replace) {
     OFileFacts facts;

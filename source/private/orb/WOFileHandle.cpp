@@ -7,6 +7,7 @@
 #include <windows.h>
 
 #include <limits>
+#include <new>
 
 namespace {
 
@@ -30,7 +31,7 @@ DWORD MethodOf(OMoveFrom from) {
 
 } // namespace
 
-OFileHandle OOpenFile(OPath const &path, unsigned int access, ODisposition disposition, unsigned int flags) {
+OFileHandle OOpenFile(OPath const &path, unsigned int access, ODisposition disposition, unsigned int flags) try {
     WOLongPath const name(path);
     if (!name.IsValid()) {
         return INVALID_HANDLE_VALUE;
@@ -38,6 +39,8 @@ OFileHandle OOpenFile(OPath const &path, unsigned int access, ODisposition dispo
     DWORD const wanted =
         ((access & kOAccessRead) != 0 ? GENERIC_READ : 0U) | ((access & kOAccessWrite) != 0 ? GENERIC_WRITE : 0U);
     return CreateFileW(name.c_str(), wanted, FILE_SHARE_READ, nullptr, DispositionOf(disposition), flags, nullptr);
+} catch (std::bad_alloc const &) {
+    return INVALID_HANDLE_VALUE;
 }
 
 bool OIsOpen(OFileHandle handle) noexcept { return handle != nullptr && handle != INVALID_HANDLE_VALUE; }

@@ -11,6 +11,7 @@
 #include <windows.h>
 
 #include <utility>
+#include <vector>
 
 namespace {
 
@@ -19,6 +20,35 @@ OError MakeOne(wchar_t const *name) { return CreateDirectoryW(name, nullptr) != 
 bool IsFolderThere(wchar_t const *name) {
     DWORD const attributes = GetFileAttributesW(name);
     return attributes != INVALID_FILE_ATTRIBUTES && (attributes & FILE_ATTRIBUTE_DIRECTORY) != 0;
+}
+
+// The same, where a folder that is there will do: also one that another process has just made. A root is denied rather
+// than found to exist.
+OError MakeOrFind(OPath const &path) {
+    WOLongPath const name(path);
+    OError const error = MakeOne(name.c_str());
+    bool const mayBeThere = error == OError::AlreadyExists || error == OError::AccessDenied;
+    return mayBeThere && IsFolderThere(name.c_str()) ? OError::None : error;
+}
+
+// Goes up to a folder that is there, then down again. By lengths of the one text: there may be more folders on the way
+// than calls fit the stack.
+OError MakeWithParents(OPath const &full) {
+    std::vector<std::size_t> missing;
+    OPath place(full);
+    OError error = MakeOrFind(place);
+    while (error == OError::NotFound) {
+        missing.push_back(place.GetString().length());
+        place = place.GetParent();
+        if (place.IsEmpty()) {
+            return error;
+        }
+        error = MakeOrFind(place);
+    }
+    for (; error == OError::None && !missing.empty(); missing.pop_back()) {
+        error = MakeOrFind(OPath(OString(full.GetString().c_str(), missing.back())));
+    }
+    return error;
 }
 
 // A walk over a folder, and over those below it if they are wanted. Folders that are still to be read are kept in a
@@ -94,27 +124,7 @@ OError OMakeFolder(OPath const &path, bool parents) {
     if (!name.IsValid()) {
         return OError::InvalidName;
     }
-    OError error = MakeOne(name.c_str());
-    if (!parents || error == OError::None) {
-        return error;
-    }
-    if (error == OError::NotFound) {
-        OPath const parent = OGetFullPath(path).GetParent();
-        if (parent.IsEmpty()) {
-            return error;
-        }
-        OError const above = OMakeFolder(parent, true);
-        if (above != OError::None) {
-            return above;
-        }
-        error = MakeOne(name.c_str());
-    }
-    // Also when another process has just made it. A root is denied rather than found to exist.
-    bool const isThere = error == OError::AlreadyExists || error == OError::AccessDenied;
-    if (isThere && IsFolderThere(name.c_str())) {
-        return OError::None;
-    }
-    return error;
+    return parents ? MakeWithParents(OGetFullPath(path)) : MakeOne(name.c_str());
 }
 
 OError OListFolder(OPath const &folder, OListing const &wanted, std::vector<KTString> &names) {

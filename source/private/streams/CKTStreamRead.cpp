@@ -2,9 +2,9 @@
 
 #include "CKTStreamRead.h"
 
-#include "KTAssert.h"
 #include "OByteOrder.h"
 #include "OFileShortcut.h"
+#include "OStreamReport.h"
 #include "OStreamText.h"
 
 #include <algorithm>
@@ -93,7 +93,7 @@ KTString CKTStreamRead::XferString(KTString &value, bool utf8, bool withCount) t
     text.Assign(value, utf8);
     return value;
 } catch (std::bad_alloc const &) {
-    OReportNoMemory("CKTStreamRead::XferString - out of memory", kReportPath, kMemoryLine);
+    OStreamReport("CKTStreamRead::XferString - out of memory", kReportPath, kMemoryLine);
     return {};
 }
 
@@ -118,8 +118,8 @@ KTBool16 CKTStreamRead::XferBool(KTBool16 &value) {
         XferInt16(number);
     }
     if (number != 0 && number != 1) {
-        KTAssertFailed("CKTStreamRead::XferBool - this isn't a bool you are reading. Something's wrong.", kReportPath,
-                       kBoolLine);
+        OStreamReport("CKTStreamRead::XferBool - this isn't a bool you are reading. Something's wrong.", kReportPath,
+                      kBoolLine);
     }
     value = number;
     return value;

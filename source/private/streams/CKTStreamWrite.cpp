@@ -2,9 +2,9 @@
 
 #include "CKTStreamWrite.h"
 
-#include "KTAssert.h"
 #include "OByteOrder.h"
 #include "OFileShortcut.h"
+#include "OStreamReport.h"
 #include "OStreamText.h"
 
 #include <cstring>
@@ -98,7 +98,7 @@ KTString CKTStreamWrite::XferString(KTString &value, bool utf8, bool withCount) 
     WriteBytes(text.Bytes(), text.Count());
     return value;
 } catch (std::bad_alloc const &) {
-    OReportNoMemory("CKTStreamWrite::XferString - out of memory", kReportPath, kMemoryLine);
+    OStreamReport("CKTStreamWrite::XferString - out of memory", kReportPath, kMemoryLine);
     return {};
 }
 
@@ -114,14 +114,14 @@ int CKTStreamWrite::XferByteReverse(unsigned char *buffer, int count) {
 // ---- integers ----
 
 int CKTStreamWrite::XferBool(KTBool16 *values, int count) {
-    KTAssertFailed("Warning: Using XferBool(KTBool16 *buf, KTInt32 num) is currently not crossplatfom savvy",
-                   kReportPath, kBoolArrayLine);
+    OStreamReport("Warning: Using XferBool(KTBool16 *buf, KTInt32 num) is currently not crossplatfom savvy",
+                  kReportPath, kBoolArrayLine);
     return XferInt16(values, count);
 }
 
 KTBool16 CKTStreamWrite::XferBool(KTBool16 &value) {
     if (value != 0 && value != 1) {
-        KTAssertFailed("CStreamWrite::XferBool - this isn't a bool you are writing", kReportPath, kBoolLine);
+        OStreamReport("CStreamWrite::XferBool - this isn't a bool you are writing", kReportPath, kBoolLine);
     }
     value = value != 0 ? 1 : 0;
     if (IsPlain()) {

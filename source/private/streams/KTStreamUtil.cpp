@@ -6,9 +6,9 @@
 #include "CKTStreamReadWrite.h"
 #include "CKTStreamWrite.h"
 #include "FileXferBytes.h"
-#include "KTAssert.h"
 #include "KTFileUtil.h"
 #include "MemXferBytes.h"
+#include "OStreamReport.h"
 
 #include <algorithm>
 #include <cstring>
@@ -56,7 +56,7 @@ struct Block {
 
 bool CopyCheck(bool isGood, char const *message, int line) {
     if (!isGood) {
-        KTAssertFailed(message, kReportPath, line);
+        OStreamReport(message, kReportPath, line);
     }
     return isGood;
 }
@@ -87,7 +87,7 @@ bool AreEqual(IKTStream &first, IKTStream &second, unsigned int size) {
     while (size != 0) {
         int const wanted = static_cast<int>(std::min(size, kBlock));
         int const count = first.XferByte(blocks[0].bytes, wanted);
-        if (second.XferByte(blocks[1].bytes, wanted) != count ||
+        if (second.XferByte(blocks[1].bytes, wanted) != count || count < 0 || count > wanted || // a host's may say so
             std::memcmp(blocks[0].bytes, blocks[1].bytes, static_cast<unsigned int>(count)) != 0) {
             return false;
         }
@@ -149,7 +149,7 @@ KTErrorCodeEnum KTStreamUtil::StreamCopy(IKTStream *source, IKTStream *target) {
         CopyBlock(*source, *target, block, kBlock);
     }
     if (rest >= kBlock) {
-        KTAssertFailed("something is wrong", kReportPath, kRemainderLine);
+        OStreamReport("something is wrong", kReportPath, kRemainderLine);
     }
     CopyBlock(*source, *target, block, rest);
     SeekBack(*source, before);
@@ -163,7 +163,7 @@ KTErrorCodeEnum KTStreamUtil::SaveReadStreamToFile(IKTStream *stream, KTFile con
     }
     std::unique_ptr<IKTStream> const writer(CreateFileStreamWrite(file, FileXferBytes::kOpenWrite, kIgnored, kIgnored));
     if (writer == nullptr || writer->GetStreamState() == kKTStreamStateError) {
-        KTAssertFailed("stream creation failed", kReportPath, kCreationLine);
+        OStreamReport("stream creation failed", kReportPath, kCreationLine);
         return kKTErrorFailed;
     }
     writer->Seek(0, kKTSeekFromBeginning);

@@ -7,6 +7,7 @@
 
 #include <algorithm>
 #include <cstring>
+#include <new>
 
 namespace {
 
@@ -108,7 +109,9 @@ void MemXferBytes::SetEndOfStream() {
 }
 
 // Names the file that a full block would spill to and goes no further, on purpose: the capacity is a hard limit.
-void MemXferBytes::CreateFileBackingStore() {
+// Without memory for the name there is none to discard.
+void MemXferBytes::CreateFileBackingStore() try {
     m_BackingStore = nullptr;
     KTFile const file(OString::FromUTF8(kBackingFileName));
+} catch (std::bad_alloc const &) { // NOLINT(bugprone-empty-catch)
 }

@@ -2,13 +2,11 @@
 
 #include "OStreamText.h"
 
-#include "KTAssert.h"
 #include "OUtfBlocks.h"
 
 #include <algorithm>
 #include <cstring>
 #include <limits>
-#include <new>
 
 namespace {
 
@@ -132,13 +130,6 @@ void AssignUnits(KTString &text, unsigned char const *bytes, std::size_t count) 
 int OStreamTextSize(KTString const &text, bool utf8) {
     std::size_t const size = utf8 ? text.GetUTF8String().size() : text.size() * sizeof(unsigned short);
     return static_cast<int>(std::min<std::size_t>(size, std::numeric_limits<int>::max()));
-}
-
-void OReportNoMemory(char const *message, char const *path, int line) noexcept {
-    try {
-        KTAssertFailed(message, path, line);
-    } catch (std::bad_alloc const &) { // NOLINT(bugprone-empty-catch)
-    }
 }
 
 void OAssignStreamText(KTString &text, unsigned char const *bytes, std::size_t count, bool utf8) {

@@ -11,9 +11,6 @@
 /// Bytes that the text takes in UTF-8 or UTF-16, at most those of the largest signed 32-bit number. Throws std::bad_alloc.
 int OStreamTextSize(KTString const &text, bool utf8);
 
-/// Reports that there is no memory for a text. The report itself may need some: then it is left out.
-void OReportNoMemory(char const *message, char const *path, int line) noexcept;
-
 /// Short texts need no memory from the heap.
 inline constexpr std::size_t kOShortTextUnits = 256;
 

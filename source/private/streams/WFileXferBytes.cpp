@@ -15,9 +15,9 @@
 
 #include "FileXferBytes.h"
 
-#include "KTAssert.h"
 #include "OFileHandle.h"
 #include "OFileShortcut.h"
+#include "OStreamReport.h"
 
 #include <algorithm>
 #include <cstring>
@@ -85,6 +85,18 @@ ODisposition DispositionOf(unsigned int mode) {
     return empties ? ODisposition::TruncateExisting : ODisposition::OpenExisting;
 }
 
+// Whether there was memory for the name.
+bool TakeName(KTFile &to, KTFile const &from) {
+    try {
+        if (&to != &from) {
+            to = from;
+        }
+        return true;
+    } catch (std::bad_alloc const &) {
+        return false;
+    }
+}
+
 } // namespace
 
 FileXferBytes::FileXferBytes() : FileXferBytes(kNormalAttribute) {}
@@ -96,11 +108,13 @@ FileXferBytes::~FileXferBytes() { FileXferBytes::Close(); }
 // ---- open and close ----
 
 KTBool16 FileXferBytes::Open(KTFile const &file, unsigned int mode, unsigned int, unsigned int) {
-    if (&file != &m_File) {
-        m_File = file;
-    }
+    bool const isNamed = TakeName(m_File, file);
     if (m_Handle != nullptr && m_State != kKTStreamStateClosed) {
         Close();
+    }
+    if (!isNamed) {
+        m_State = kKTStreamStateClosed;
+        return 0;
     }
     bool const writes = (mode & kOpenWrite) != 0;
     bool const appends = (mode & kOpenAppend) != 0;
@@ -117,12 +131,16 @@ KTBool16 FileXferBytes::Open(KTFile const &file, unsigned int mode, unsigned int
         return 0;
     }
     m_SequentialReadTotal = 0;
+    m_State = kKTStreamStateGood;
     if (writes) {
         MoveHandle(0, appends ? kKTSeekFromEnd : kKTSeekFromBeginning);
     } else {
         RereadPosition();
     }
-    m_State = kKTStreamStateGood;
+    if (m_State != kKTStreamStateGood) { // the end of 4 GiB and more: what is to be appended would go to the beginning
+        FileXferBytes::Close();
+        return 0;
+    }
     return 1;
 }
 
@@ -157,7 +175,7 @@ void FileXferBytes::SetEndOfStream() {
 
 void FileXferBytes::AssertHandle(int line) const {
     if (m_Handle == nullptr) {
-        KTAssertFailed(kNoHandle, kReportPath, line);
+        OStreamReport(kNoHandle, kReportPath, line);
     }
 }
 
@@ -177,11 +195,11 @@ unsigned int FileXferBytes::Write(void *buffer, unsigned int count) {
         return WriteBytes(buffer, count);
     }
     if (m_WriteBuffer == nullptr) {
-        KTAssertFailed("FileXferBytes::Write - nil buffer", kReportPath, kNoBufferLine);
+        OStreamReport("FileXferBytes::Write - nil buffer", kReportPath, kNoBufferLine);
         return 0; // there is nowhere to put the bytes
     }
     if (count > m_WriteCapacity - static_cast<unsigned int>(m_WriteFill)) {
-        KTAssertFailed("FileXferBytes::Write - overflowing buffer", kReportPath, kOverflowLine);
+        OStreamReport("FileXferBytes::Write - overflowing buffer", kReportPath, kOverflowLine);
         return 0; // nothing is written behind the buffer
     }
     OCopyBytes(m_WriteBuffer + m_WriteFill, static_cast<unsigned char const *>(buffer), count);

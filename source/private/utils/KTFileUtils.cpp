@@ -137,7 +137,8 @@ KTString KTFileUtil::GetPathOnly(KTFile const &file, short withSeparator) {
     KTString folder(PathOf(file).GetParent().GetString());
     if (withSeparator != 0 && !folder.empty()) {
         unsigned short const last = folder[folder.size() - 1];
-        if (last != '\\' && last != '/') {
+        bool const isDrive = last == ':'; // its current folder; with a separator it would be its root
+        if (last != '\\' && last != '/' && !isDrive) {
             folder.push_back('\\');
         }
     }

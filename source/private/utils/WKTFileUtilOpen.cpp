@@ -45,6 +45,12 @@ bool IsFileThere(std::wstring const &path) {
     return OGetFacts(WOMakePath(path.data(), path.size()), facts) == OError::None && !facts.isFolder;
 }
 
+// The file that the system would start by this name, which may lack its extension; empty if there is none.
+std::wstring FileToStart(std::wstring const &name) {
+    std::wstring const full = name + L".exe";
+    return IsFileThere(name) ? name : IsFileThere(full) ? full : std::wstring();
+}
+
 // The program of a command line such as "C:\App\app.exe" "%1". Without quotation marks a path may have blanks in it:
 // then the first beginning of the line that is a file counts, as when the system starts it.
 std::wstring ProgramOf(std::wstring const &command) {
@@ -58,13 +64,15 @@ std::wstring ProgramOf(std::wstring const &command) {
     }
     std::wstring const line = command.substr(start);
     std::size_t const first = line.find(L' ');
-    for (std::size_t end = first; end != std::wstring::npos; end = line.find(L' ', end + 1)) {
-        std::wstring const beginning = line.substr(0, end);
-        if (IsFileThere(beginning) || IsFileThere(beginning + L".exe")) {
-            return beginning;
+    for (std::size_t end = first;; end = line.find(L' ', end + 1)) {
+        std::wstring file = FileToStart(line.substr(0, end));
+        if (!file.empty()) {
+            return file;
+        }
+        if (end == std::wstring::npos) {
+            return line.substr(0, first);
         }
     }
-    return IsFileThere(line) ? line : line.substr(0, first);
 }
 
 std::wstring CommandOf(std::wstring const &className) {

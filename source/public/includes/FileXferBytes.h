@@ -86,7 +86,8 @@ class KT_PUBLIC_API FileXferBytes : public IKTXferBytes {
     void SetEndOfStream() override;
 
     /// Opens a file; one that is open is closed first. `mode` is made of the bits of OpenMode; the other two numbers are
-    /// ignored. Others may read the file meanwhile. Returns 1 and state good, or 0 and state closed.
+    /// ignored. Others may read the file meanwhile. Returns 1 and state good, or 0 and state closed: also without memory
+    /// for the name, and for a file to be appended to that ends at 4 GiB or beyond.
     virtual KTBool16 Open(KTFile const &file, unsigned int mode, unsigned int ignored, unsigned int ignoredToo);
 
     /// Writes out what is gathered and closes the file; does nothing more to a closed one. The state is closed then, so

@@ -134,7 +134,8 @@ class KT_PUBLIC_API KTFileUtil {
     static KTString GetFileName(KTFile const &file);
     static KTString GetFileName(KTString const &path);
 
-    /// The path without its last element; with `withSeparator` not 0 it ends with a separator. Empty if there is none.
+    /// The path without its last element; with `withSeparator` not 0 it ends with a separator, so that a name may follow,
+    /// but for the current folder of a drive ("C:"), which one would make its root. Empty if there is none.
     static KTString GetPathOnly(KTFile const &file, short withSeparator);
 
     /// The path from its root on: relative paths are completed from the current folder, "." and ".." worked out, "/"
@@ -198,12 +199,14 @@ class KT_PUBLIC_API KTFileUtil {
     /// Copies a folder and all in it to a path where nothing is; the target appears when all is copied. Links to folders
     /// are left out, links to files become the files. kErrorNotFound for a missing folder or target's parent,
     /// kErrorNotAFolder for a file, kErrorAlreadyExists if anything is at the target, kErrorFailed if it lies in the
-    /// folder itself, else what kept a file from being copied; nothing stays at the target then.
+    /// folder itself, kErrorInvalidName if something in it has a name that only others can have given, else what kept a
+    /// file from being copied; nothing stays at the target then.
     static ErrorCodeEnum FolderCopy(KTPath const &from, KTPath const &to);
 
     /// Moves a file or a folder, also to another drive. Errors as for FileCopy; a folder's target must not be there.
-    /// A read-only file can be moved. On another drive the copy stays if the original could not be deleted, which is an
-    /// error.
+    /// A read-only file can be moved. To another drive it is copied, and deleted once the copy is on the disk; a folder
+    /// with links to folders in it stays where it is then, as they would be lost: kErrorFailed. The copy stays if the
+    /// original could not be deleted, which is an error.
     static ErrorCodeEnum MoveFileW(KTFile const &from, KTFile const &to, bool replaceExisting = false);
 
     /// Gives a file or folder another name in its folder. kErrorInvalidName if that is no single valid name,

@@ -81,7 +81,7 @@ class KT_PUBLIC_API KTStreamUtil {
     /// A copy of the stream's bytes in a temporary file ".ikt" in the session folder, which stays until the session
     /// folder is deleted. The copy reads, and stands at its end: seek to the beginning first. The source goes back to
     /// where its Tell was before. Null if the file could not be made, or `stream` is null or not reading; the caller
-    /// deletes the copy.
+    /// deletes the copy. That the disk did not take all of it shows in the copy's state alone, after Flush or Seek.
     static IKTStream *Clone(IKTStream *stream);
 
     /// Whether both hold the same bytes: 1 or 0. Any other strategy gives 1 without looking at them, null included. A
