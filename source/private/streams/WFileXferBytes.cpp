@@ -137,10 +137,11 @@ KTBool16 FileXferBytes::Open(KTFile const &file, unsigned int mode, unsigned int
     } else {
         RereadPosition();
     }
-    if (m_State != kKTStreamStateGood) { // the end of 4 GiB and more: what is to be appended would go to the beginning
-        FileXferBytes::Close();
+    if (writes && appends && m_State != kKTStreamStateGood) {
+        FileXferBytes::Close(); // the end is out of reach: what is to be appended would go to the beginning
         return 0;
     }
+    m_State = kKTStreamStateGood; // others may have no position, as a pipe
     return 1;
 }
 
