@@ -53,7 +53,42 @@ void FillLists() {
     }
 }
 
+// What is left of sixteen blocks that a thread took and gave back after its end had begun.
+bool g_WatchesEnd = false;
+bool g_SawEnd = false;
+std::size_t g_LeftAtEnd = 0;
+
+// The program's own callback at a thread's end comes after those of the libraries.
+void NTAPI AtThreadsEnd(void *, DWORD reason, void *) {
+    if (reason == DLL_THREAD_DETACH && g_WatchesEnd) {
+        std::size_t const before = BlocksInUse();
+        void *blocks[kKept];
+        for (void *&block : blocks) {
+            block = KTAllocateUnits(256);
+        }
+        for (void *const block : blocks) {
+            KTFreeUnits(block, 256);
+        }
+        g_LeftAtEnd = BlocksInUse() - before;
+        g_SawEnd = true;
+    }
+}
+
 } // namespace
+
+// Among the addresses that the system calls at every thread's start and end.
+extern "C" {
+extern PIMAGE_TLS_CALLBACK const ktAtThreadsEnd;
+[[gnu::section(".CRT$XLY"), gnu::used]] PIMAGE_TLS_CALLBACK const ktAtThreadsEnd = AtThreadsEnd;
+}
+
+TEST(TextMemory, NothingIsKeptOnceAThreadsEndHasBegun) {
+    g_WatchesEnd = true;
+    InNewThread([] { KTString const text("a text that needs memory of its own"); });
+    g_WatchesEnd = false;
+    ASSERT_TRUE(g_SawEnd);
+    EXPECT_EQ(g_LeftAtEnd, 0U);
+}
 
 TEST(TextMemory, TheBlockGivenBackLastIsTheNextOne) {
     for (std::size_t const size : kKeptSizes) {

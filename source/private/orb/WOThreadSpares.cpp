@@ -18,13 +18,16 @@ namespace {
 // Until the initialiser below has run, and after the system refused a slot, the index is the invalid one.
 DWORD g_Slot = TLS_OUT_OF_INDEXES;
 
+// Stands in the slot of a thread that ends, closed, so that blocks which come later are not kept.
+OThreadSpares g_None;
+
 struct SlotOwner {
-    SlotOwner() { g_Slot = TlsAlloc(); }
+    SlotOwner() {
+        g_None.Close();
+        g_Slot = TlsAlloc();
+    }
 };
 SlotOwner const g_Owner;
-
-// Stands in the slot of a thread that ends, so that blocks which come later are not kept.
-OThreadSpares g_None;
 
 class LastErrorKeeper {
   public:
