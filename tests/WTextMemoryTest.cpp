@@ -22,6 +22,7 @@ constexpr std::size_t kKeptSizes[] = {16, 32, 64, 128, 256};
 
 std::vector<void *> Allocate(std::size_t count, std::size_t size) {
     std::vector<void *> blocks;
+    blocks.reserve(count);
     for (std::size_t i = 0; i < count; ++i) {
         blocks.push_back(KTAllocateUnits(size));
     }
