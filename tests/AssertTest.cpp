@@ -87,6 +87,11 @@ TEST(FormatArgs, ReturnsOneStaticBuffer) {
     EXPECT_STREQ(FORMAT_ARGS("%s", ""), "");
 }
 
+TEST(FormatArgs, NullFormatGivesAnEmptyText) {
+    EXPECT_STREQ(FORMAT_ARGS("before"), "before");
+    EXPECT_STREQ(FORMAT_ARGS(nullptr), "");
+}
+
 TEST(FormatArgs, CutsSilentlyAt2047Bytes) {
     LogLines log;
     for (std::size_t const length : {2046U, 2047U, 2048U, 2049U, 10000U}) {

@@ -242,6 +242,8 @@ TEST(Encoding, AutomationStringsOwnTheirText) {
     EXPECT_EQ(moved.Length(), 0U);
     copy.Attach(detached);
     EXPECT_EQ(KTString(copy, 0), "first");
+    copy.Attach(copy.m_str); // owned already
+    EXPECT_EQ(KTString(copy, 0), "first");
     copy = CComBSTR(L"second");
     EXPECT_EQ(KTString(copy, 0), "second");
     EXPECT_EQ(CComBSTR(nullptr).m_str, nullptr);

@@ -234,6 +234,26 @@ TEST(Condition, ANotificationWakesAWaiterBeforeTheDeadline) {
     EXPECT_TRUE(inTime);
 }
 
+TEST(Condition, ANotificationInTimeCountsAlthoughTheMutexIsBusyUntilAfterTheDeadline) {
+    constexpr int kMilliseconds = 300;
+    for (bool inTime = false; !inTime;) {
+        KTMutex mutex;
+        KTCondition condition;
+        KTLock lock(mutex);
+        boost::posix_time::ptime const deadline =
+            Clock::universal_time() + boost::posix_time::milliseconds(kMilliseconds);
+        boost::thread notifier([&] {
+            KTLock const busy(mutex); // not before the waiter waits
+            condition.notify_one();
+            inTime = Clock::universal_time() < deadline; // else once more: the machine was too slow
+            boost::this_thread::sleep(deadline + boost::posix_time::milliseconds(50));
+        });
+        bool const woken = condition.timed_wait(lock, kMilliseconds);
+        notifier.join();
+        EXPECT_EQ(woken || !inTime, true);
+    }
+}
+
 TEST(Condition, WaitReleasesTheMutexMeanwhile) {
     KTMutex mutex;
     KTCondition condition;

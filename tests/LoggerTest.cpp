@@ -89,6 +89,13 @@ TEST(Logger, WithoutPerCentSignTheFormatIsTheMessage) {
     EXPECT_EQ(log.Take(), (Lines{"verbatim \\n {}", "wide verbatim", "%"}));
 }
 
+TEST(Logger, ANullFormatIsWrittenAsTheRunTimeWritesNullTexts) {
+    LogLines log;
+    gKTLogger->Log(static_cast<char const *>(nullptr));
+    gKTLogger->Log(static_cast<wchar_t const *>(nullptr), 1);
+    EXPECT_EQ(log.Take(), (Lines{"(null)", "(null)"}));
+}
+
 TEST(Logger, SwitchedOffNothingIsWrittenAndSwitchedOnTheFileGoesOn) {
     LogLines log;
     gKTLogger->Log("before");

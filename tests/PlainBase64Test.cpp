@@ -3,12 +3,14 @@
 
 #include "KTBase64.h"
 #include "KTHttpDate.h"
+#include "LogLines.h"
 
 #include <gtest/gtest.h>
 
 #include <random>
 #include <stdexcept>
 #include <string>
+#include <vector>
 
 using KTBase64::Runs;
 
@@ -30,6 +32,18 @@ TEST(PlainBase64, GivesWhatTheFastestCodeGives) {
         text.insert(random() % (text.size() + 1), 1, '-');
         ASSERT_THROW(KTBase64::Decode(text, Runs::Plain), std::invalid_argument);
     }
+}
+
+// The encoder counts right by construction, so the check is asked by itself.
+TEST(PlainBase64, AnotherNumberOfCharactersThanTheTextHoldsIsReported) {
+    using Lines = std::vector<std::string>;
+    LogLines log;
+    EXPECT_TRUE(KTBase64::IsWhole(0, 0));
+    EXPECT_TRUE(KTBase64::IsWhole(8, 8));
+    EXPECT_EQ(log.Take(), Lines{});
+    EXPECT_FALSE(KTBase64::IsWhole(7, 8));
+    EXPECT_FALSE(KTBase64::IsWhole(12, 8));
+    EXPECT_EQ(log.Take(), Lines(2, "Assert failed:  at source/private/utils/KTPublicUtils:231"));
 }
 
 TEST(HttpDate, HasTheFixedForm) {

@@ -86,7 +86,8 @@ TEST(StringNumbers, TextOf99BytesFitsAnd100DoesNot) {
 
 TEST(StringNumbers, FormatsThatReadPointersAreRefused) {
     LogLines log;
-    for (char const *format : {"%s", "%S", "%Z", "%n", "%-10s", "%d %s", "%% %hs", "%*.*ls"}) {
+    for (char const *format :
+         {"%s", "%S", "%Z", "%n", "%-10s", "%d %s", "%% %hs", "%*.*ls", "%Fs", "%hNs", "%1$s", "%'s", "% %s"}) {
         EXPECT_EQ(WithNumber(1, format), "") << format;
         EXPECT_EQ(log.Take(),
                   Lines{"Assert failed: Number format reads a pointer at source/private/utils/KTString:301"});

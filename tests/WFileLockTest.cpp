@@ -70,9 +70,11 @@ struct Call {
 
 Call g_Call{};
 DWORD g_Error = 0;
+std::wstring g_Name;
 
-HANDLE WINAPI RecordCreateFile(wchar_t const *, DWORD access, DWORD share, SECURITY_ATTRIBUTES *security,
+HANDLE WINAPI RecordCreateFile(wchar_t const *name, DWORD access, DWORD share, SECURITY_ATTRIBUTES *security,
                                DWORD disposition, DWORD flags, HANDLE pattern) {
+    g_Name = name;
     g_Call = {{access, share, disposition, flags, 0},
               {reinterpret_cast<ULONG_PTR>(security), reinterpret_cast<ULONG_PTR>(pattern), 0, 0}};
     SetLastError(g_Error);
@@ -112,6 +114,27 @@ TEST(FileLock, OpensTheFileAsLaidDown) {
     EXPECT_EQ(g_Call.overlapped[0], 0U); // no security attributes
     EXPECT_EQ(g_Call.overlapped[1], 0U); // no template
     EXPECT_EQ(error.get_native_error(), ERROR_ACCESS_DENIED);
+}
+
+TEST(FileLock, OpensFilesInDeepFolders) {
+    WImportHook const hook(kLibrary, "CreateFileW", &RecordCreateFile);
+    ASSERT_TRUE(hook.IsActive());
+    std::wstring const deep = L"C:\\" + std::wstring(200, L'a') + L"\\" + std::wstring(200, L'b') + L"\\x.lock";
+    g_Error = ERROR_ACCESS_DENIED;
+    Thrown([&] { KTInterProcessFileLock const lock(KTString(deep.c_str())); });
+    EXPECT_EQ(g_Name, L"\\\\?\\" + deep) << "without the system's limit of 260 characters";
+    // What has no such form goes to the system as it stands, for its own answer.
+    Thrown([] { KTInterProcessFileLock const lock("C:\\a*b"); });
+    EXPECT_EQ(g_Name, L"C:\\a*b");
+}
+
+// Cut at the zero, the name would be that of another file.
+TEST(FileLock, ANameWithAZeroInsideIsRefused) {
+    FileToLock const file;
+    KTString const longer = file.Path() + static_cast<unsigned short>(0) + "x";
+    interprocess_exception const error = Thrown([&] { KTInterProcessFileLock const lock(longer); });
+    EXPECT_EQ(error.get_native_error(), ERROR_INVALID_NAME);
+    EXPECT_EQ(error.get_error_code(), boost::interprocess::path_error);
 }
 
 TEST(FileLock, LocksAndUnlocksTheWholeFile) {

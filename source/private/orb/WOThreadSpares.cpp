@@ -18,17 +18,17 @@ namespace {
 // Until the initialiser below has run, and after the system refused a slot, the index is the invalid one.
 DWORD g_Slot = TLS_OUT_OF_INDEXES;
 
+// Stands in the slot of a thread that ends, closed, so that blocks which come later are not kept: those of a program's
+// own thread-local texts, say.
+OThreadSpares g_None;
+
 struct SlotOwner {
-    SlotOwner() { g_Slot = TlsAlloc(); }
+    SlotOwner() {
+        g_None.Close();
+        g_Slot = TlsAlloc();
+    }
 };
 SlotOwner const g_Owner;
-
-// Stands in the slot of a thread that ends, so that blocks which come later are not kept: those of a program's own
-// thread-local texts, say. It is closed from the start, as all threads share it.
-struct NoSpares : OThreadSpares {
-    NoSpares() noexcept { Close(); }
-};
-NoSpares g_None;
 
 class LastErrorKeeper {
   public:

@@ -71,6 +71,10 @@ void KTAssertFailed(char const *message, char const *path, KTInt32 line) {
 void KTAssertFail(char const *, ...) {}
 
 char *FORMAT_ARGS(char const *format, ...) {
+    if (format == nullptr) {
+        g_ShortBuffer[0] = 0;
+        return g_ShortBuffer;
+    }
     std::va_list values;
     va_start(values, format);
     OFormatTruncating(g_ShortBuffer, kShortSize, format, values);

@@ -2,6 +2,7 @@
 
 #include "KTBase64.h"
 
+#include "KTAssert.h"
 #include "OUtfBlocks.h"
 #include "OUtfSse41.h"
 
@@ -28,14 +29,18 @@ char *EncodeGroups(Byte const *from, Byte const *end, char *to) {
     return to;
 }
 
-// The last one or two bytes: two or three characters, their last one's missing bits 0, and the padding.
-void EncodeRest(Byte const *from, std::size_t left, char *to) {
+// The last one or two bytes, if any are left: two or three characters, their last one's missing bits 0, and the padding.
+char *EncodeRest(Byte const *from, std::size_t left, char *to) {
+    if (left == 0) {
+        return to;
+    }
     char const *const alphabet = KTBase64::kAlphabet.data();
     unsigned const bits = (unsigned{from[0]} << 16) | (left == 2 ? unsigned{from[1]} << 8 : 0U);
     to[0] = alphabet[bits >> 18];
     to[1] = alphabet[(bits >> 12) & 63];
     to[2] = left == 2 ? alphabet[(bits >> 6) & 63] : kPad;
     to[3] = kPad;
+    return to + kGroupCharacters;
 }
 
 // Collects bits of characters and gives bytes.
@@ -115,20 +120,30 @@ class Decoder {
 
 } // namespace
 
+bool KTBase64::IsWhole(std::size_t written, std::size_t size) {
+    if (written == size) {
+        return true;
+    }
+    KTAssertFailed("", "source/private/utils/KTPublicUtils", 231);
+    return false;
+}
+
 std::string KTBase64::Encode(std::string_view bytes, Runs runs) {
     std::size_t const size = EncodedSize(bytes.size());
+    std::size_t written = 0;
     std::string text;
-    OUtf::FillExactly(text, size, [bytes, runs](char *to) {
+    OUtf::FillExactly(text, size, [bytes, runs, &written](char *const to) {
         auto const *const from = reinterpret_cast<Byte const *>(bytes.data());
         bool const usesRuns = runs == Runs::Fastest && OUtf::HasSse41();
         std::size_t const taken = usesRuns ? EncodeRunSse41(from, bytes.size(), to) : 0;
         std::size_t const rest = bytes.size() % kGroupBytes;
         Byte const *const end = from + (bytes.size() - rest);
-        to = EncodeGroups(from + taken, end, to + taken / kGroupBytes * kGroupCharacters);
-        if (rest != 0) {
-            EncodeRest(end, rest, to);
-        }
+        char *const next = EncodeGroups(from + taken, end, to + taken / kGroupBytes * kGroupCharacters);
+        written = static_cast<std::size_t>(EncodeRest(end, rest, next) - to);
     });
+    if (!IsWhole(written, size)) {
+        text.clear();
+    }
     return text;
 }
 

@@ -44,10 +44,14 @@ constexpr std::size_t EncodedSize(std::size_t size) {
     return (size + 2) / 3 * 4;
 }
 
+/// Whether the encoder wrote as many characters, padding included, as the text holds. Anything else is reported as an
+/// assertion without a message.
+bool IsWhole(std::size_t written, std::size_t size);
+
 /// Which code does the long runs: the processor's byte shuffles (SSE4.1) where there are any, or plain tables.
 enum class Runs { Fastest, Plain };
 
-/// The bytes as text. Throws std::length_error.
+/// The bytes as text; empty if IsWhole finds it is not whole. Throws std::length_error.
 std::string Encode(std::string_view bytes, Runs runs = Runs::Fastest);
 
 /// The bytes that the text stands for. Throws std::invalid_argument at a character that is neither of the alphabet, nor

@@ -26,6 +26,10 @@ CComBSTR::~CComBSTR() { OFreeBStr(m_str); }
 
 KTUInt32 CComBSTR::Length() const { return OBStrLength(m_str); }
 
-void CComBSTR::Attach(wchar_t *bstr) noexcept { OFreeBStr(std::exchange(m_str, bstr)); }
+void CComBSTR::Attach(wchar_t *bstr) noexcept {
+    if (bstr != m_str) {
+        OFreeBStr(std::exchange(m_str, bstr));
+    }
+}
 
 wchar_t *CComBSTR::Detach() noexcept { return std::exchange(m_str, nullptr); }

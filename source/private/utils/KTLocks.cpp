@@ -51,9 +51,12 @@ void KTCondition::wait(KTLock &lock) { m_Impl->get().wait(lock.get()->get()); }
 void KTCondition::wait(KTRecursiveLock &lock) { m_Impl->get().wait(lock.get()->get()); }
 
 bool KTCondition::timed_wait(KTLock &lock, int milliseconds) {
-    boost::posix_time::ptime const deadline =
-        boost::posix_time::microsec_clock::universal_time() + boost::posix_time::milliseconds(milliseconds);
-    return m_Impl->get().timed_wait(lock.get()->get(), deadline);
+    using Clock = boost::posix_time::microsec_clock;
+    boost::posix_time::ptime const deadline = Clock::universal_time() + boost::posix_time::milliseconds(milliseconds);
+    // Boost's wait for a point in time answers by the clock once it holds the mutex again: a notification in time would
+    // count for nothing where the mutex is busy until after the deadline. Its wait for a duration says whether it was
+    // woken.
+    return m_Impl->get().timed_wait(lock.get()->get(), deadline - Clock::universal_time());
 }
 
 void KTCondition::notify_one() { m_Impl->get().notify_one(); }

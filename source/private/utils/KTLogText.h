@@ -21,8 +21,11 @@ inline char const *KTFindPerCent(char const *format) { return std::strchr(format
 inline wchar_t const *KTFindPerCent(wchar_t const *format) { return std::wcschr(format, L'%'); }
 
 /// The text of a variadic log call: formatted into a block of just the size that the run-time counts, or the format
-/// itself when it holds no per cent sign.
+/// itself when it holds no per cent sign. A null format becomes what the run-time makes of a null text.
 template <typename Char> std::basic_string<Char> KTFormatLogText(Char const *format, std::va_list values) {
+    if (format == nullptr) {
+        return {'(', 'n', 'u', 'l', 'l', ')'};
+    }
     if (KTFindPerCent(format) == nullptr) {
         return format;
     }

@@ -31,16 +31,22 @@ KTErrorCodeEnum AppendFormatted(KTString &text, char const *format, ...) {
     return kKTErrorNone;
 }
 
-// Whether no conversion of the format would read its value as a pointer.
+// Whether no conversion of the format would read its value as a pointer. Flags, width, precision and sizes of every
+// run-time may stand before the conversion's letter, those of near and far pointers included. A per cent sign behind
+// any of them begins anew, as run-times differ there.
 bool ReadsOnlyNumbers(std::string const &format) {
-    constexpr char kBetween[] = "-+ #0123456789.*hlLqjztIw"; // flags, width, precision and sizes
-    for (std::size_t at = format.find('%'); at != std::string::npos; at = format.find('%', at + 1)) {
-        at = format.find_first_not_of(kBetween, at + 1);
+    constexpr char kBetween[] = "-+ #'0123456789.*$hlLqjztIwFN";
+    for (std::size_t at = format.find('%'); at != std::string::npos; at = format.find('%', at)) {
+        std::size_t const start = at + 1;
+        at = format.find_first_not_of(kBetween, start);
         if (at == std::string::npos) {
             return true;
         }
         if (std::string("sSZn").find(format[at]) != std::string::npos) {
             return false;
+        }
+        if (format[at] != '%' || at == start) {
+            ++at;
         }
     }
     return true;

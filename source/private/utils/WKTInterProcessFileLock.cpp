@@ -5,6 +5,7 @@
 #include "KTInterProcessFileLock.h"
 
 #include "WOHandle.h"
+#include "WOLongPath.h"
 
 #include <boost/interprocess/errors.hpp>
 #include <boost/interprocess/exceptions.hpp>
@@ -23,17 +24,27 @@ constexpr DWORD kWholeFile = 0xFFFFFFFF; // low and high half of the length
         boost::interprocess::error_info(static_cast<boost::interprocess::native_error_t>(code)), "");
 }
 
-} // namespace
-
-KTInterProcessFileLock::KTInterProcessFileLock(KTString const &path) : m_Impl(nullptr) {
-    WOHandle file(CreateFileW(path.GetWstring().c_str(), GENERIC_READ | GENERIC_WRITE,
+// The file is named by the path's extended form, as everywhere in the library, so that it may lie in a deep folder. What
+// has no such form goes to the system as it was written, for its own answer; a zero inside would name another file.
+WOHandle OpenLockFile(KTString const &path) {
+    if (path.find(static_cast<unsigned short>(0)) != KTString::npos) {
+        ThrowSystemError(ERROR_INVALID_NAME);
+    }
+    std::wstring const written = path.GetWstring();
+    WOLongPath const extended(OPath(path.GetOString()));
+    WOHandle file(CreateFileW(extended.IsValid() ? extended.c_str() : written.c_str(), GENERIC_READ | GENERIC_WRITE,
                               FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr, OPEN_EXISTING, 0,
                               nullptr));
     if (!file.IsValid()) {
         ThrowSystemError(GetLastError());
     }
-    m_Impl = new KTInterProcessFileLockImpl{std::move(file)};
+    return file;
 }
+
+} // namespace
+
+KTInterProcessFileLock::KTInterProcessFileLock(KTString const &path)
+    : m_Impl(new KTInterProcessFileLockImpl{OpenLockFile(path)}) {}
 
 KTInterProcessFileLock::KTInterProcessFileLock(KTInterProcessFileLock const &other) = default;
 

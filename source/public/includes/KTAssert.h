@@ -28,8 +28,8 @@ KT_PUBLIC_API void KTAssertFailed(char const *message, char const *path, KTInt32
 KT_PUBLIC_API void KTAssertFail(char const *format, ...);
 
 /// Formats like printf into one static buffer of 2048 bytes and returns that buffer; the next call overwrites it.
-/// Longer output is cut to 2047 bytes without notice. REQUIRES: format is not null and fits its values. Allocates
-/// nothing. One thread at a time.
+/// Longer output is cut to 2047 bytes without notice. A null format gives an empty text. REQUIRES: the format fits its
+/// values. Allocates nothing. One thread at a time.
 KT_PUBLIC_API char *FORMAT_ARGS(char const *format, ...);
 
 /// Formats like printf into a growing buffer (4096 bytes at first, 4096 more at each attempt, up to 4,100,096, kept

@@ -34,7 +34,8 @@ class KT_PUBLIC_API CComBSTR {
     /// Length in wide characters, zeros inside counted; 0 for null.
     KTUInt32 Length() const;
 
-    /// Takes ownership of an automation string made elsewhere, after freeing the one held.
+    /// Takes ownership of an automation string made elsewhere, after freeing the one held; nothing happens if it is the
+    /// one held.
     void Attach(wchar_t *bstr) noexcept;
 
     /// Gives the automation string to the caller, who frees it, and holds null afterwards.

@@ -21,8 +21,8 @@ struct KTInterProcessFileLockImpl;
 /// and copy the pointer only, so two handles then delete one object.
 class KT_PUBLIC_API KTInterProcessFileLock {
   public:
-    /// Opens the existing file at the full path `path` for reading and writing, shared with everybody. Throws
-    /// boost::interprocess::interprocess_exception if it cannot be opened; no object results then.
+    /// Opens the existing file at the full path `path`, of any length, for reading and writing, shared with everybody.
+    /// Throws boost::interprocess::interprocess_exception if it cannot be opened; no object results then.
     explicit KTInterProcessFileLock(KTString const &path);
     KTInterProcessFileLock(KTInterProcessFileLock const &other);
     KTInterProcessFileLock &operator=(KTInterProcessFileLock const &other);

@@ -119,8 +119,9 @@ class KT_PUBLIC_API KTCondition {
     void wait(KTRecursiveLock &lock);
 
     /// The same, up to a deadline computed once on entry: the UTC time now plus `milliseconds`. Returns true when woken
-    /// before the deadline, false when it passed; 0 or less returns false at once when nobody notifies. The mutex is
-    /// held again in both cases. A step of the system clock moves the deadline with it.
+    /// before the deadline, however long the mutex is busy then, false when it passed; 0 or less returns false at once
+    /// when nobody notifies. The mutex is held again in both cases. A step of the system clock meanwhile changes
+    /// nothing. On Windows the system may end the wait late by 32 milliseconds or 5 per cent, at most a second.
     bool timed_wait(KTLock &lock, int milliseconds);
 
     /// Wakes one waiter; does nothing when nobody waits.

@@ -35,13 +35,13 @@ class KT_PUBLIC_API KTLogger {
     /// Writes one line: the low byte of each wide character.
     virtual void Log(std::wstring const &message) = 0;
 
-    /// Formats like wprintf and writes one line. REQUIRES: format is not null and fits its values.
+    /// Formats like wprintf and writes one line; a null format writes "(null)". REQUIRES: the format fits its values.
     virtual void Log(wchar_t const *const format, ...) = 0;
 
     /// Writes one line: the bytes as they are.
     virtual void Log(std::string const &message);
 
-    /// Formats like printf and writes one line. REQUIRES: format is not null and fits its values.
+    /// Formats like printf and writes one line; a null format writes "(null)". REQUIRES: the format fits its values.
     virtual void Log(char const *const format, ...);
 
     /// Whether anything is written; true from the start.
