@@ -69,8 +69,12 @@ class KT_PUBLIC_API KTStringDictionary : public IKTStringDictionary {
 
     /// Adds the entries of a file of any form and version to those that are there; a key that was there gets the new
     /// text. kKTErrorFailed if nothing is there. Else kKTErrorNone, whatever the file holds: reading ends where a file
-    /// is damaged, and what was read until then stays. Entries of files of version 1 are kept, but GetKeyValue does not
-    /// find them. The file is read into memory and closed; its texts stay there as they are.
+    /// is damaged, and what was read until then stays; nothing is read of a file that cannot be opened or that somebody
+    /// writes to meanwhile. Entries of files of version 1 are kept, but GetKeyValue does not find them.
+    ///
+    /// The file is read into memory and closed. A binary file of 1 MiB and more on a fixed disk of this machine is mapped
+    /// instead, and stays open until the dictionary goes: others may read it, nobody can write to it, and if it is
+    /// deleted its name is not free before that.
     KTErrorCodeEnum ReadFromFile(KTFile const &file) override;
 
   private:
