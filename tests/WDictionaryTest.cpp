@@ -1,7 +1,7 @@
-// WDictionaryTest.cpp: the dictionary where the system fails it: no memory, a file that cannot be written, mapped or
-// shared.
+// WDictionaryTest.cpp: the dictionary where the system fails it: no memory, text that cannot be converted, a file that
+// cannot be written, mapped or shared.
 
-#include "DictionaryReader.h"
+#include "DictionaryFiles.h"
 #include "KTException.h"
 #include "KTPublicUtils.h"
 #include "KTStringDictionary.h"
@@ -10,12 +10,16 @@
 
 #include <gtest/gtest.h>
 
+#include <bit>
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
 #include <new>
 #include <string>
+#include <string_view>
 #include <vector>
+
+using namespace dictionary_files;
 
 namespace {
 
@@ -108,6 +112,64 @@ TEST_F(WDictionaryTest, WithoutMemoryForWritingThereIsNoFile) {
         EXPECT_THROW(Texts().WriteToFile(File("new"), binary), std::bad_alloc);
         EXPECT_FALSE(File("new").Exists());
     }
+}
+
+// ---- text that the system refuses ----
+
+// Refuses text with an exclamation mark. This program's own import may be the one that is replaced.
+int WINAPI RefuseText(UINT page, DWORD flags, LPCCH bytes, int count, LPWSTR units, int capacity) {
+    bool const isRefused = std::string_view(bytes, static_cast<std::size_t>(count)).find('!') != std::string_view::npos;
+    auto *const convert = std::bit_cast<decltype(&MultiByteToWideChar)>(
+        GetProcAddress(GetModuleHandleW(L"kernel32.dll"), "MultiByteToWideChar"));
+    return isRefused ? 0 : convert(page, flags, bytes, count, units, capacity);
+}
+
+constexpr char kText[] = "/Before=b\n/Refused=!\n/Behind=c\n";
+
+// The text of "/A" is of three bytes, which are refused.
+SmallFile Multibyte() {
+    SmallFile file;
+    file.encoding = 2;
+    file.rawValues = "B!BHHH";
+    file.valueOffsets = {0, 3};
+    file.valueLengths = {3, 3};
+    return file;
+}
+
+TEST_F(WDictionaryTest, TextThatCannotBeConvertedIsNeverThrown) {
+    KTFile const text = File("text", kText);
+    Texts().ReadFromFile(File("binary", Multibyte().Bytes()));
+    {
+        WImportHook const hook(kLibrary, "MultiByteToWideChar", &RefuseText);
+        ASSERT_TRUE(hook.IsActive());
+        KTErrorCodeEnum read = kKTErrorFailed;
+        EXPECT_NO_THROW(read = Texts().ReadFromFile(text));
+        EXPECT_EQ(kKTErrorNone, read);
+        KTString found;
+        EXPECT_NO_THROW(found = Texts().GetKeyValue(KTString("/A=default")));
+        EXPECT_EQ(KTString("default"), found);
+        EXPECT_NO_THROW(found = Texts().GetKeyValue(KTString("/A")));
+        EXPECT_EQ(KTString(), found);
+        EXPECT_EQ(KTString("HHH"), Texts().GetKeyValue(KTString("/Bc")));
+    }
+    EXPECT_EQ(KTString("B!B"), Texts().GetKeyValue(KTString("/A")));
+    EXPECT_EQ(KTString("b"), Texts().GetKeyValue(KTString("/Before"))) << "what was read before it stays";
+    EXPECT_EQ(KTString("none"), Texts().GetKeyValue(KTString("/Behind=none")));
+}
+
+TEST_F(WDictionaryTest, TextThatCannotBeConvertedClearsTheFlag) {
+    WImportHook const hook(nullptr, "MultiByteToWideChar", &RefuseText); // of the engine in this program
+    ASSERT_TRUE(hook.IsActive());
+    DictionaryReader dictionary;
+    Problems problems;
+    ReadBytes(dictionary, kText, &problems);
+    EXPECT_FALSE(dictionary.IsValid());
+    EXPECT_EQ("/Before=b", List(dictionary));
+    EXPECT_EQ("2:damaged:", problems.Text());
+    DictionaryReader old;
+    ReadBytes(old, Header(1, 5, 2).U32(1).U32(2).U32s({2, 1}).U16(548).Raw("/A!").Bytes(), &problems);
+    EXPECT_FALSE(old.IsValid());
+    EXPECT_EQ("2:damaged: 0:damaged:", problems.Text());
 }
 
 // ---- files ----

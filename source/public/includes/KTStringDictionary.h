@@ -57,7 +57,8 @@ class KT_PUBLIC_API KTStringDictionary : public IKTStringDictionary {
     /// The text stored under the key, up to its first zero unit. If there is none, the default behind the key's "=",
     /// with its escapes and entities replaced; each byte of its UTF-8 becomes one unit, sign-extended, so that defaults
     /// should be ASCII: a byte above 127 gives a unit from U+FF80 on. If there is no default either, or the key is none:
-    /// an empty string. Never fails. Takes about as long in a large dictionary as in a small one.
+    /// an empty string. Never fails: a text of the ANSI code page that the system does not convert counts as none. Takes
+    /// about as long in a large dictionary as in a small one.
     KTString GetKeyValue(KTString const &key) override;
 
     /// Writes all entries to a new file: binary (version 2.7, UTF-16, little-endian), or text (UTF-16, little-endian,
