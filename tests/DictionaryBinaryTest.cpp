@@ -527,6 +527,28 @@ TEST(DictionaryBinaryTest, Version10GoesIntoTheOldTable) {
     }
 }
 
+TEST(DictionaryBinaryTest, Version1TextsOfAnyOtherEncodingAreOfTheAnsiCodePage) {
+    for (unsigned const encoding : {2U, 255U}) {
+        for (std::string const &file :
+             {Header(1, 5, encoding).U32(1).U32(2).U32s({2, 2}).U16(548).Raw("/AH\xE9").Bytes(), Header(1, 0, encoding)
+                                                                                                     .U16(2)
+                                                                                                     .U16(548)
+                                                                                                     .U32(0)
+                                                                                                     .U16(0)
+                                                                                                     .U32(12)
+                                                                                                     .U32(2)
+                                                                                                     .Raw("/A")
+                                                                                                     .U32(2)
+                                                                                                     .Raw("H\xE9")
+                                                                                                     .Bytes()}) {
+            DictionaryReader read;
+            ReadBytes(read, file);
+            EXPECT_TRUE(read.IsValid());
+            EXPECT_EQ("/A=H" + Show(MultibyteToUnits(kEncodingAnsi, "\xE9")), Chain(read, 548));
+        }
+    }
+}
+
 TEST(DictionaryBinaryTest, Version1KeepsWhatWasReadBeforeTheDamage) {
     for (std::string const &whole : {Version15().Bytes(), Version10().Bytes()}) {
         std::string const cut = whole.substr(0, whole.size() - 1);

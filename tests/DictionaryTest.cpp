@@ -7,8 +7,10 @@
 #include "KTStringDictionary.h"
 #include "Units.h"
 
+#include <boost/thread/thread.hpp>
 #include <gtest/gtest.h>
 
+#include <atomic>
 #include <bit>
 #include <filesystem>
 #include <fstream>
@@ -276,6 +278,38 @@ TEST_F(DictionaryTest, EntriesOfVersion1AreNotFound) {
     std::string file("LexiStr Binary Format\1\5\0\1\0\0\0\2\0\0\0\2\0\0\0\2\0\0\0\x24\2/Ax\0", 24 + 22);
     EXPECT_EQ(kKTErrorNone, Texts().ReadFromFile(File(u8"old", file)));
     EXPECT_EQ(KTString("default"), Texts().GetKeyValue(KTString("/A=default")));
+}
+
+// Filled on one thread, then asked and written by several; ThreadSanitizer watches in the native build.
+TEST_F(DictionaryTest, SeveralThreadsMayLookUpAndWrite) {
+    dictionary_files::SmallFile multibyte; // converted anew by each lookup
+    multibyte.encoding = 1;
+    multibyte.rawValues = "BHello!";
+    multibyte.valueBytes = 7;
+    multibyte.valueOffsets = {0, 1};
+    multibyte.valueLengths = {1, 6};
+    Texts().ReadFromFile(File(u8"multibyte", multibyte.Bytes()));
+    Texts().ReadFromFile(File(u8"text", "/T=a\\nb\n"));
+    Texts().AddString("/Added", "added");
+    Texts().AddString("/Added", "replaced");
+    boost::thread_group threads;
+    std::atomic<int> wrong = 0;
+    for (int thread = 0; thread < 4; ++thread) {
+        KTFile const copy = File((u8"copy" + std::u8string(1, static_cast<char8_t>('0' + thread))).c_str());
+        threads.create_thread([copy, &wrong] {
+            for (int i = 0; i < 200; ++i) {
+                bool const isRight = Texts().GetKeyValue("/A") == "B" && Texts().GetKeyValue("/Bc=x") == "Hello!" &&
+                                     Texts().GetKeyValue("/T") == "a\nb" &&
+                                     Texts().GetKeyValue("/Added") == "replaced" &&
+                                     Texts().GetKeyValue("/None=x#{copy}") == KTString("x\xC2\xA9");
+                wrong += isRight ? 0 : 1;
+            }
+            wrong += Texts().WriteToFile(copy, true) == kKTErrorNone && copy.Exists() ? 0 : 1;
+        });
+    }
+    threads.join_all();
+    EXPECT_EQ(0, wrong);
+    EXPECT_EQ(Content(u8"copy0"), Content(u8"copy3"));
 }
 
 // A host's own dictionary behind the same interface.

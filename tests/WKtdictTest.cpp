@@ -401,6 +401,18 @@ TEST_F(KtdictGetTest, LooksIntoEachFileByItself) {
     EXPECT_FALSE(none["results"][0].Has("text"));
 }
 
+TEST_F(KtdictGetTest, GivesNoMoreThanTheApplicationGets) {
+    Write(L"a.txt", "/A=one#{0}two\n/Z=#{0}\n");
+    for (wchar_t const *const key : {L"/A", L"/B=one#{0}two"}) {
+        EXPECT_EQ("one\n", Run({L"get", key, L"a.txt"}).out);
+        EXPECT_EQ("one\n", Run({L"get", L"--raw", key, L"a.txt"}).out);
+        JsonValue const json = Run({L"get", L"--format", L"json", key, L"a.txt"}).Json();
+        EXPECT_EQ("one", json["results"][0]["text"].text);
+    }
+    EXPECT_EQ("\n", Run({L"get", L"/Z", L"a.txt"}).out);
+    EXPECT_EQ("/A=one\\u0000two\n/Z=\\u0000\n", Run({L"dump", L"--no-header", L"a.txt"}).out) << "all of it";
+}
+
 TEST_F(KtdictGetTest, SaysThatEntriesOfVersion1AreNotFound) {
     Write(L"old.lxdc", Header(1, 0, 1).U16(2).U16(7).U32(0).U16(0).U32(11).U32(2).Raw("/A").U32(1).Raw("B").Bytes());
     KtdictOutcome const outcome = Run({L"get", L"/A", L"old.lxdc"});

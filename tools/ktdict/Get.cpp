@@ -27,6 +27,7 @@ bool Print(Options const &options, LoadedFile const &file, Report &report) {
     KTUnits scratch;
     UnitsView text;
     DictionaryFound const found = file.Dictionary().Lookup(options.key, scratch, text);
+    text = text.substr(0, text.find(static_cast<unsigned short>(0))); // where the application's text ends
     bool const isOld = found != DictionaryFound::Entry && file.HasOldEntry(SplitKeyText(options.key).name);
     if (report.IsJson()) {
         JsonWriter &json = report.Json();

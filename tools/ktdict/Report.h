@@ -15,10 +15,10 @@
 struct Finding {
     std::string_view file;  ///< as the user wrote it
     std::uint64_t line = 0; ///< from 1; 0 when there is none
-    std::optional<std::uint64_t> byte = {};
-    std::string_view kind = {};
-    std::optional<std::string_view> key = {};
-    std::string_view detail = {}; ///< English
+    std::optional<std::uint64_t> byte;
+    std::string_view kind;
+    std::optional<std::string_view> key;
+    std::string_view detail; ///< English
 };
 
 /// The output of one command: as text, or as one JSON document whose first member, "problems", has the findings.

@@ -116,7 +116,7 @@ class ByteSource {
     ByteSource &operator=(ByteSource const &) = delete;
     virtual ~ByteSource() = default;
 
-    /// Bytes in all, when the source was opened. No more than these are read of a file that grows meanwhile.
+    /// Bytes in all, when the source was opened. Of a binary file that grows meanwhile no more than these are read.
     virtual std::uint64_t Size() const = 0;
 
     /// Reads up to `count` bytes; fewer only at the end or after a failure of the device, which Failed then tells.

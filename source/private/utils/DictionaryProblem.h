@@ -30,7 +30,8 @@ enum class DictionaryProblemKind : int {
     // both forms
     DuplicateKey, ///< the key was there before: the new text replaces the old one
     // binary form
-    Damaged,    ///< the file cannot be read on from here; what was read before is kept; no longer valid
+    Damaged,    ///< the file cannot be read on from here; what was read before is kept; no longer valid (also a text
+                ///< form's line that the system does not convert)
     BadBucket,  ///< the lists of the hash buckets do not fit the keys: not needed, no longer valid
     ReadFailed, ///< the device failed; no longer valid
     // writing

@@ -36,12 +36,21 @@ void DictionaryTextReader::Report(DictionaryProblemKind kind, std::uint64_t offs
 void DictionaryTextReader::Read(BufferedSource &source) {
     auto const lines = MakeLineReader(source);
     KTUnits line;
-    while (lines->Next(line)) {
-        m_Line = lines->LineNumber();
-        ReadLine(line);
+    bool isRefused = false;
+    try {
+        while (lines->Next(line)) {
+            m_Line = lines->LineNumber();
+            ReadLine(line);
+        }
+    } catch (TextConversionException const &) {
+        isRefused = true; // of 2 GiB, for example
     }
     m_Line = lines->LineNumber();
     m_Key.clear();
+    if (isRefused) {
+        m_Dictionary.m_IsValid = false;
+        Report(DictionaryProblemKind::Damaged, 0, "the line cannot be converted; nothing is read from here on");
+    }
     if (lines->EndedEarly()) {
         Report(DictionaryProblemKind::EarlyEnd, 0, "a zero begins the line; nothing is read from here on");
     }

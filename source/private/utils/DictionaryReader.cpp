@@ -82,7 +82,11 @@ bool DictionaryReader::FindBytes(std::string_view name, KTUnits &scratch, std::s
     if (index < 0) {
         return false;
     }
-    bytes = m_Array->ValueBytes(static_cast<std::uint32_t>(index), scratch);
+    try {
+        bytes = m_Array->ValueBytes(static_cast<std::uint32_t>(index), scratch);
+    } catch (TextConversionException const &) {
+        return false; // lookups do not fail: a text that the system cannot convert is as good as none
+    }
     return true;
 }
 

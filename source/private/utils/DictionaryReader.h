@@ -123,7 +123,8 @@ class DictionaryReader {
     DictionaryFound Lookup(std::string_view keyText, KTUnits &scratch, UnitsView &text,
                            int encoding = kEncodingNone) const;
 
-    /// The first part of that for a name alone: here, then in the default dictionary. False if neither has it.
+    /// The first part of that for a name alone: here, then in the default dictionary. False if neither has it, or its
+    /// text cannot be converted.
     bool LookupName(std::string_view name, KTUnits &scratch, UnitsView &text) const;
 
     /// The same, the text as the bytes of its units, which may begin at an odd address: nothing is copied for that.

@@ -158,7 +158,8 @@ void FastArray::LinkEntry(std::uint32_t tag, std::uint32_t index, std::string_vi
     m_Replaced.erase(before);
     ++m_DeadCount;
     if (observer != nullptr) {
-        observer->OnProblem({DictionaryProblemKind::DuplicateKey, 0, 0, std::string(key), {}});
+        observer->OnProblem({DictionaryProblemKind::DuplicateKey, 0, 0, std::string(key),
+                             "the key was there before; the later entry takes its place"});
     }
 }
 

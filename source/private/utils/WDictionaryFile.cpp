@@ -87,7 +87,7 @@ class FileSource final : public ByteSource {
 
 class FileSink final : public NewFile {
   public:
-    explicit FileSink(WOHandle handle) : m_Handle(std::move(handle)) { m_Pending.reserve(kPending); }
+    FileSink() { m_Pending.reserve(kPending); }
     FileSink(FileSink const &) = delete;
     FileSink &operator=(FileSink const &) = delete;
 
@@ -98,6 +98,9 @@ class FileSink final : public NewFile {
             SetFileInformationByHandle(m_Handle.Get(), FileDispositionInfo, &disposition, sizeof disposition);
         }
     }
+
+    // Takes the file, which nobody else has.
+    void Own(WOHandle handle) { m_Handle = std::move(handle); }
 
     void Write(void const *bytes, std::size_t count) override {
         if (m_Pending.size() + count > kPending) {
@@ -138,6 +141,18 @@ class FileSink final : public NewFile {
     std::string m_Pending;
 };
 
+// Whether the folder lists the name. It does so for a file that has been deleted and is still open somewhere, to which the
+// system denies all access.
+bool IsListed(wchar_t const *name) {
+    WIN32_FIND_DATAW entry{};
+    HANDLE const search = FindFirstFileW(name, &entry);
+    if (search == INVALID_HANDLE_VALUE) {
+        return false;
+    }
+    FindClose(search);
+    return true;
+}
+
 } // namespace
 
 std::unique_ptr<ByteSource> OpenDictionaryFile(OPath const &path) {
@@ -160,13 +175,16 @@ std::unique_ptr<NewFile> CreateDictionaryFile(OPath const &path, bool &isTaken) 
     if (!name.IsValid()) {
         return nullptr;
     }
+    auto sink = std::make_unique<FileSink>(); // first: no file is left where there is no memory
     WOHandle handle(
         CreateFileW(name.c_str(), GENERIC_WRITE | DELETE, 0, nullptr, CREATE_NEW, FILE_ATTRIBUTE_NORMAL, nullptr));
     if (!handle.IsValid()) {
-        isTaken = GetLastError() == ERROR_FILE_EXISTS;
+        DWORD const error = GetLastError();
+        isTaken = error == ERROR_FILE_EXISTS || (error == ERROR_ACCESS_DENIED && IsListed(name.c_str()));
         return nullptr;
     }
-    return std::make_unique<FileSink>(std::move(handle));
+    sink->Own(std::move(handle));
+    return sink;
 }
 
 } // namespace orvik_private

@@ -57,7 +57,8 @@ class KT_PUBLIC_API KTStringDictionary : public IKTStringDictionary {
     /// The text stored under the key, up to its first zero unit. If there is none, the default behind the key's "=",
     /// with its escapes and entities replaced; each byte of its UTF-8 becomes one unit, sign-extended, so that defaults
     /// should be ASCII: a byte above 127 gives a unit from U+FF80 on. If there is no default either, or the key is none:
-    /// an empty string. Never fails. Takes about as long in a large dictionary as in a small one.
+    /// an empty string. Never fails: a text of the ANSI code page that the system does not convert counts as none. Takes
+    /// about as long in a large dictionary as in a small one.
     KTString GetKeyValue(KTString const &key) override;
 
     /// Writes all entries to a new file: binary (version 2.7, UTF-16, little-endian), or text (UTF-16, little-endian,
@@ -69,8 +70,12 @@ class KT_PUBLIC_API KTStringDictionary : public IKTStringDictionary {
 
     /// Adds the entries of a file of any form and version to those that are there; a key that was there gets the new
     /// text. kKTErrorFailed if nothing is there. Else kKTErrorNone, whatever the file holds: reading ends where a file
-    /// is damaged, and what was read until then stays. Entries of files of version 1 are kept, but GetKeyValue does not
-    /// find them. The file is read into memory and closed; its texts stay there as they are.
+    /// is damaged, and what was read until then stays; nothing is read of a file that cannot be opened or that somebody
+    /// writes to meanwhile. Entries of files of version 1 are kept, but GetKeyValue does not find them.
+    ///
+    /// The file is read into memory and closed. A binary file of 1 MiB and more on a fixed disk of this machine is mapped
+    /// instead, and stays open until the dictionary goes: others may read it, nobody can write to it, and if it is
+    /// deleted its name is not free before that.
     KTErrorCodeEnum ReadFromFile(KTFile const &file) override;
 
   private:
