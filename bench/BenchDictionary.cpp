@@ -252,6 +252,7 @@ void AddGrowth() {
         AddMapFind({kGrowth, "find", size.name}, size.entries);
         Add({kGrowth, "fill", size.name}, kOurs, [entries = size.entries](benchmark::State &state) {
             std::vector<std::pair<KTString, KTString>> texts;
+            texts.reserve(entries);
             for (std::size_t i = 0; i < entries; ++i) {
                 texts.emplace_back(TextFor(KeyOf(i)), TextFor(TextOf(i)));
             }
@@ -265,6 +266,7 @@ void AddGrowth() {
         });
         Add({kGrowth, "fill", size.name}, kMap, [entries = size.entries](benchmark::State &state) {
             std::vector<std::pair<std::u16string, std::u16string>> texts;
+            texts.reserve(entries);
             for (std::size_t i = 0; i < entries; ++i) {
                 texts.emplace_back(KeyOf(i), TextOf(i));
             }

@@ -19,7 +19,7 @@ constexpr char kWithout[] = "no-handler";
 
 [[gnu::noinline]] std::uint64_t Work(std::vector<std::uint64_t> const &numbers) {
     try {
-        std::vector<std::uint64_t> const copy(numbers); // something to destroy
+        std::vector<std::uint64_t> const copy(numbers.begin(), numbers.end()); // something to destroy
         return std::accumulate(copy.begin(), copy.end(), std::uint64_t{0});
     } catch (std::exception const &) {
         return 0;

@@ -113,7 +113,7 @@ template <typename Text> std::vector<std::pair<Text, Text>> Names(int lines) {
 
 void LoadOurs(benchmark::State &state) {
     KTString const path = TextOf(SettingsFile().Path());
-    for (auto _ : state) {
+    for ([[maybe_unused]] auto _ : state) {
         KTSimpleIniFileReader reader(path);
         benchmark::DoNotOptimize(&reader);
     }
@@ -121,7 +121,7 @@ void LoadOurs(benchmark::State &state) {
 
 // `Ini` is CSimpleIniCaseA, whose texts are the file's own bytes, or CSimpleIniCaseW, which makes UTF-16 of them.
 template <typename Ini> void LoadSimpleIni(benchmark::State &state) {
-    for (auto _ : state) {
+    for ([[maybe_unused]] auto _ : state) {
         Ini ini(true);
         benchmark::DoNotOptimize(ini.LoadFile(SettingsFile().Path().c_str()));
     }
@@ -132,7 +132,7 @@ template <typename Ini> void LoadSimpleIni(benchmark::State &state) {
 void GetOurs(benchmark::State &state) {
     KTString const path = TextOf(SettingsFile().Path());
     auto const names = Names<KTString>(kLines);
-    for (auto _ : state) {
+    for ([[maybe_unused]] auto _ : state) {
         KTSimpleIniFileReader reader(path);
         KTString value;
         for (auto const &[section, variable] : names) {
@@ -143,7 +143,7 @@ void GetOurs(benchmark::State &state) {
 
 template <typename Ini, typename Text> void GetSimpleIni(benchmark::State &state) {
     auto const names = Names<Text>(kLines);
-    for (auto _ : state) {
+    for ([[maybe_unused]] auto _ : state) {
         Ini ini(true);
         ini.LoadFile(SettingsFile().Path().c_str());
         Text value;
@@ -162,7 +162,7 @@ void GetOneOurs(benchmark::State &state) {
     KTSimpleIniFileReader reader(path);
     KTString value;
     std::size_t next = 0;
-    for (auto _ : state) {
+    for ([[maybe_unused]] auto _ : state) {
         auto const &[section, variable] = names[next];
         benchmark::DoNotOptimize(reader.GetStringValForVariable(section, variable, value));
         next = (next + 7919) % names.size();
@@ -173,7 +173,7 @@ void GetOneSystem(benchmark::State &state) {
     auto const names = Names<std::wstring>(kLines);
     std::size_t next = 0;
     wchar_t value[256];
-    for (auto _ : state) {
+    for ([[maybe_unused]] auto _ : state) {
         auto const &[section, variable] = names[next];
         benchmark::DoNotOptimize(GetPrivateProfileStringW(section.c_str(), variable.c_str(), L"", value, 256,
                                                           SettingsFile().Path().c_str()));
@@ -189,7 +189,7 @@ void GetIntOurs(benchmark::State &state) {
     KTString const section("Player");
     KTString const variable("Width");
     int value = 0;
-    for (auto _ : state) {
+    for ([[maybe_unused]] auto _ : state) {
         benchmark::DoNotOptimize(reader.GetIntValForVariable(section, variable, value));
         benchmark::DoNotOptimize(value);
     }
@@ -199,7 +199,7 @@ void GetIntSimpleIni(benchmark::State &state) {
     File const file("ktbench-numbers.ini", "[Player]\nWidth=1024\n");
     CSimpleIniCaseA ini(true);
     ini.LoadFile(file.Path().c_str());
-    for (auto _ : state) {
+    for ([[maybe_unused]] auto _ : state) {
         benchmark::DoNotOptimize(ini.GetLongValue("Player", "Width"));
     }
 }
@@ -209,13 +209,13 @@ void GetIntSimpleIni(benchmark::State &state) {
 void ReadCaptions(benchmark::State &state, unsigned int mode) {
     KTString const path = TextOf(CaptionFile().Path());
     KTClosedCaptionFileReader reader;
-    for (auto _ : state) {
+    for ([[maybe_unused]] auto _ : state) {
         benchmark::DoNotOptimize(reader.GetLinesFromFile(path, mode));
     }
 }
 
 void SplitLines(benchmark::State &state, char const *separators, boost::algorithm::token_compress_mode_type mode) {
-    for (auto _ : state) {
+    for ([[maybe_unused]] auto _ : state) {
         std::vector<std::vector<std::string>> rows;
         std::ifstream file(CaptionFile().Path(), std::ios::binary);
         std::string line;
@@ -233,14 +233,14 @@ void AddGrowth() {
         std::string const size = std::to_string(lines);
         Add({kGrowthGroup, "settings", size}, kOurs, [lines](benchmark::State &state) {
             File const file("ktbench-growth.ini", Settings(lines));
-            for (auto _ : state) {
+            for ([[maybe_unused]] auto _ : state) {
                 KTSimpleIniFileReader reader(TextOf(file.Path()));
                 benchmark::DoNotOptimize(&reader);
             }
         });
         Add({kGrowthGroup, "captions", size}, kOurs, [lines](benchmark::State &state) {
             File const file("ktbench-growth.txt", Captions(lines));
-            for (auto _ : state) {
+            for ([[maybe_unused]] auto _ : state) {
                 benchmark::DoNotOptimize(KTClosedCaptionFileReader().GetLinesFromFile(TextOf(file.Path()), 4U));
             }
         });
