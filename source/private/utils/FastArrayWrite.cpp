@@ -15,6 +15,7 @@ namespace {
 // Puts numbers and units in a byte order, some thousand bytes at a time.
 class FieldWriter {
   public:
+    // NOLINTNEXTLINE(cppcoreguidelines-pro-type-member-init): the array is written as far as it is used
     FieldWriter(ByteSink &sink, std::endian order) : m_Sink(sink), m_Swap(order != std::endian::native) {}
 
     void U16(std::uint16_t value) {

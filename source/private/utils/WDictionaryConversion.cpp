@@ -10,17 +10,16 @@ std::int64_t AnsiToUnits(std::string_view bytes, unsigned short *units, std::siz
     if (bytes.empty()) {
         return 0;
     }
+    char const *const text = bytes.data();
     int const size = static_cast<int>(bytes.size());
-    int const count = MultiByteToWideChar(CP_ACP, 0, bytes.data(), size, nullptr, 0);
+    int const count = MultiByteToWideChar(CP_ACP, 0, text, size, nullptr, 0);
     if (count == 0) {
         return -1;
     }
     if (static_cast<std::size_t>(count) > capacity) {
         return count;
     }
-    return MultiByteToWideChar(CP_ACP, 0, bytes.data(), size, reinterpret_cast<wchar_t *>(units), count) == count
-               ? count
-               : -1;
+    return MultiByteToWideChar(CP_ACP, 0, text, size, reinterpret_cast<wchar_t *>(units), count) == count ? count : -1;
 }
 
 bool UnitsToAnsi(UnitsView units, std::string &bytes, bool *lossy) {

@@ -22,7 +22,7 @@ struct KT_PUBLIC_API KTCallBack {
     explicit KTCallBack(KTCallBackEnum callBackKind);
     KTCallBack(KTCallBack const &other);            ///< member by member
     KTCallBack &operator=(KTCallBack const &other); ///< member by member
-    ~KTCallBack();
+    ~KTCallBack(); // NOLINT(performance-trivially-destructible): exported, as the other operations are
 
     KTCallBackEnum kind;
     KTUInt64 data1;
