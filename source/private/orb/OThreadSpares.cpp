@@ -2,7 +2,6 @@
 
 #include "OThreadSpares.h"
 
-#include <bit>
 #include <new>
 
 namespace {
@@ -21,16 +20,12 @@ constexpr bool kKeepsBlocks = false;
 constexpr bool kKeepsBlocks = true;
 #endif
 
-constexpr std::size_t kSmallestBlock = 16;
-
 // The list whose blocks are the first to hold so many bytes: 0 for up to 16, 1 for up to 32 and so on.
-constexpr std::size_t ListFor(std::size_t size) {
-    return static_cast<std::size_t>(std::bit_width((size - (size == 0 ? 0 : 1)) / kSmallestBlock));
-}
+constexpr std::size_t ListFor(std::size_t size) { return size == 0 ? 0 : (size - 1) / kOSpareBlockStep; }
 
-constexpr std::size_t BlockSize(std::size_t list) { return kSmallestBlock << list; }
+constexpr std::size_t BlockSize(std::size_t list) { return (list + 1) * kOSpareBlockStep; }
 
-static_assert(ListFor(0) == 0 && ListFor(16) == 0 && ListFor(17) == 1 && ListFor(kOLargestSpareBlock) == 4);
+static_assert(ListFor(0) == 0 && ListFor(16) == 0 && ListFor(17) == 1 && BlockSize(ListFor(255)) == 256);
 
 constexpr bool IsKept(std::size_t size) { return kKeepsBlocks && size <= kOLargestSpareBlock; }
 

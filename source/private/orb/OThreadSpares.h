@@ -5,11 +5,12 @@
 // that it last gave back, in lists by size:
 //
 //     per-thread slot --> OThreadSpares
-//                             lists[0]   16 bytes   first --> block --> block --> null     count 2
-//                             lists[1]   32 bytes   first --> null                         count 0
-//                             ...
-//                             lists[4]  256 bytes   first --> block --> null               count 1
+//                             lists[0]    16 bytes   first --> block --> block --> null     count 2
+//                             lists[1]    32 bytes   first --> null                         count 0
+//                             lists[2]    48 bytes   ...
+//                             lists[15]  256 bytes   first --> block --> null               count 1
 //
+// The sizes are the heap's own steps: coarser ones would make many texts that are kept take more memory.
 // No lock is needed, as only the owning thread touches its lists. A block may be taken by one thread and kept by
 // another. Larger blocks come from and go to the global heap, and so does what a list has no room for. Under
 // AddressSanitizer nothing is kept, so that it sees the use of a block that was given back.
@@ -18,11 +19,14 @@
 
 #include <cstddef>
 
+/// What the blocks' sizes are multiples of, in bytes.
+constexpr std::size_t kOSpareBlockStep = 16;
+
 /// Largest block in bytes that a thread keeps.
 constexpr std::size_t kOLargestSpareBlock = 256;
 
 /// Most blocks that a thread keeps of each size.
-constexpr unsigned kOMostSpareBlocks = 16;
+constexpr unsigned kOMostSpareBlocks = 8;
 
 /// A block of at least `size` bytes, aligned for any standard type: a spare one of this thread, or a new one from the
 /// global heap. Throws std::bad_alloc.
@@ -65,7 +69,7 @@ class OThreadSpares {
         unsigned count = 0;
     };
 
-    List m_Lists[5];
+    List m_Lists[kOLargestSpareBlock / kOSpareBlockStep];
 };
 
 /// This thread's spare blocks, made at the first call; null where there is no memory or no slot left for them. Once the
