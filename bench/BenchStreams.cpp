@@ -68,8 +68,8 @@ template <typename Text> struct Record {
     Text title;
 };
 
-// Texts that a KTString holds without memory from the heap, and texts that only a std::string does: the copy that
-// XferString returns needs some then.
+// Texts that a KTString holds in itself, and texts that only a std::string does: the copy that XferString returns needs
+// memory of its own then.
 using Titles = char const *const (&)[2];
 constexpr char const *kShortTitles[2] = {"Harbour", "Pier 7"};
 constexpr char const *kTitles[2] = {"Lifebuoys", "Harbour office"};
