@@ -41,9 +41,12 @@ namespace {
 
 template <typename T> T ValueAt(void const *object, std::size_t offset) {
     T value{};
-    std::memcpy(&value, static_cast<std::byte const *>(object) + offset, sizeof value);
+    std::memcpy(static_cast<void *>(&value), static_cast<std::byte const *>(object) + offset, sizeof value);
     return value;
 }
+
+// Whether two objects have the same bytes, the address of their virtual table among them.
+bool IsSame(void const *one, void const *other, std::size_t size) { return std::memcmp(one, other, size) == 0; }
 
 unsigned int NumberAt(void const *object, std::size_t offset) { return ValueAt<unsigned int>(object, offset); }
 short FlagAt(void const *object, std::size_t offset) { return ValueAt<short>(object, offset); }
@@ -238,10 +241,10 @@ TEST(AbiStreamLayoutTest, DataProvider) {
     EXPECT_EQ(5U, ValueAt<unsigned long long>(place, 16));
     EXPECT_EQ(3U, ValueAt<unsigned long long>(place, 24));
     KTMemoryDataProvider const copy(*provider);
-    EXPECT_EQ(0, std::memcmp(place, &copy, sizeof copy));
+    EXPECT_TRUE(IsSame(place, &copy, sizeof copy));
     KTMemoryDataProvider assigned(&size, 8);
     assigned = copy;
-    EXPECT_EQ(0, std::memcmp(place, &assigned, sizeof assigned));
+    EXPECT_TRUE(IsSame(place, &assigned, sizeof assigned));
     CallEntry(provider, 0);
     for (std::size_t const offset : {8U, 16U, 24U}) {
         EXPECT_EQ(nullptr, PointerAt(place, offset)) << offset;

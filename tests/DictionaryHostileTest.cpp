@@ -89,7 +89,7 @@ TEST_F(DictionaryHostileTest, CutOffAtEveryByte) {
 
 TEST_F(DictionaryHostileTest, EntriesStayWhenOnlyTheBucketsAreCutOff) {
     std::string const whole = SmallFile().Bytes();
-    constexpr std::size_t kLists = 2 * (2 + 4 + 4);
+    constexpr std::size_t kLists = std::size_t{2} * (2 + 4 + 4);
     for (std::size_t length = whole.size() - kLists; length < whole.size(); ++length) {
         DictionaryReader dictionary;
         ReadBytes(dictionary, whole.substr(0, length));
