@@ -1,5 +1,7 @@
 // WStreamSystemTest.cpp: what the file transport asks of the system, call by call, and what becomes of the bytes when the
 // system refuses. The library's imports are replaced for a time.
+//
+// Longer than other files: all of it is played through the same replacements.
 
 #include "CKTStreamRead.h"
 #include "CKTStreamReadWrite.h"
