@@ -60,6 +60,7 @@ TEST(TextMemory, TextsOfEveryLengthKeepTheirUnits) {
 TEST(TextMemory, TextsMayBeDestroyedByOtherThreads) {
     for (int round = 0; round < 20; ++round) {
         std::vector<KTString> texts;
+        texts.reserve(200);
         for (std::size_t i = 0; i < 200; ++i) {
             texts.push_back(Text(i, 'x'));
         }
