@@ -77,7 +77,7 @@ TEST_F(WFileError, EveryReasonHasItsCode) {
 TEST_F(WFileError, AListingThatCannotBeReadIsNotEmpty) {
     WImportHook const hook(L"KTPublic.dll", "FindFirstFileExW", &FailToFind);
     ASSERT_TRUE(hook.IsActive());
-    for (DWORD const code : {ERROR_ACCESS_DENIED, ERROR_NOT_READY, ERROR_NETNAME_DELETED}) {
+    for (DWORD const code : {DWORD{ERROR_ACCESS_DENIED}, DWORD{ERROR_NOT_READY}, DWORD{ERROR_NETNAME_DELETED}}) {
         g_Code = code;
         std::vector<KTString> names(1);
         EXPECT_NE(KTFileUtil::GetFileNamesInFolderAtPath(Path(""), names), KTFileUtil::kErrorNone) << code;
