@@ -4,19 +4,20 @@
 
 #include "OLongPath.h"
 #include "OUtf.h"
-#include "WOHandle.h"
+#include "WFileBytes.h"
 
 #include <windows.h>
 
-#include <algorithm>
 #include <optional>
 #include <utility>
 
 using orvik_private::ByteSource;
+using orvik_private::OpenToRead;
+using orvik_private::WFileSource;
+using orvik_private::WriteWhole;
 
 namespace {
 
-constexpr DWORD kMostAtOnce = DWORD{1} << 30;
 constexpr std::size_t kPending = std::size_t{1} << 16;
 
 std::string ToUtf8(std::wstring const &text) {
@@ -58,38 +59,14 @@ std::wstring SystemName(std::string const &path) {
     return name.starts_with(L"\\\\") ? L"\\\\?\\UNC\\" + name.substr(2) : L"\\\\?\\" + name;
 }
 
-class FileSource final : public ByteSource {
-  public:
-    FileSource(WOHandle handle, std::uint64_t size) : m_Handle(std::move(handle)), m_Size(size) {}
-
-    std::uint64_t Size() const override { return m_Size; }
-    bool Failed() const override { return m_Failed; }
-
-    std::size_t Read(void *bytes, std::size_t count) override {
-        DWORD got = 0;
-        DWORD const wanted = static_cast<DWORD>(std::min<std::size_t>(count, kMostAtOnce));
-        if (ReadFile(m_Handle.Get(), bytes, wanted, &got, nullptr) == FALSE) {
-            m_Failed = true;
-            return 0;
-        }
-        return got;
-    }
-
-  private:
-    WOHandle m_Handle;
-    std::uint64_t m_Size;
-    bool m_Failed = false;
-};
-
 std::unique_ptr<ByteSource> Open(std::wstring const &name, std::string &why) {
-    WOHandle handle(CreateFileW(name.c_str(), GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_DELETE, nullptr, OPEN_EXISTING,
-                                FILE_FLAG_SEQUENTIAL_SCAN, nullptr));
-    LARGE_INTEGER size{};
-    if (!handle.IsValid() || GetFileSizeEx(handle.Get(), &size) == FALSE) {
+    std::uint64_t size = 0;
+    WOHandle handle = OpenToRead(name.c_str(), size);
+    if (!handle.IsValid()) {
         why = ErrorText(GetLastError());
         return nullptr;
     }
-    return std::make_unique<FileSource>(std::move(handle), static_cast<std::uint64_t>(size.QuadPart));
+    return std::make_unique<WFileSource>(std::move(handle), size);
 }
 
 class TemporaryOutput final : public OutputFile {
@@ -142,14 +119,8 @@ class TemporaryOutput final : public OutputFile {
 
   private:
     void WriteOut() {
-        std::string_view left = m_Pending;
-        while (!left.empty()) {
-            DWORD done = 0;
-            DWORD const wanted = static_cast<DWORD>(std::min<std::size_t>(left.size(), kMostAtOnce));
-            if (WriteFile(m_Handle.Get(), left.data(), wanted, &done, nullptr) == FALSE || done == 0) {
-                throw std::runtime_error(ErrorText(GetLastError()));
-            }
-            left.remove_prefix(done);
+        if (!WriteWhole(m_Handle, m_Pending.data(), m_Pending.size())) {
+            throw std::runtime_error(ErrorText(GetLastError()));
         }
         m_Pending.clear();
     }

@@ -49,6 +49,9 @@ bool OExists(OPath const &path);
 /// Fills `facts`; leaves them alone on failure.
 OError OGetFacts(OPath const &path, OFileFacts &facts);
 
+/// None if a folder is there, NotAFolder for a file, else what the question failed of.
+OError OCheckFolder(OPath const &path);
+
 /// Creates an empty file. One that is there is emptied if `replace` says so, else it stays: AlreadyExists.
 OError OMakeFile(OPath const &path, bool replace);
 

@@ -205,13 +205,9 @@ OError CopyFileTo(OPath const &from, OPath const &to, bool replace, Original ori
 OError CopyFolderTo(OPath const &from, OPath const &to, Original original) {
     OPath const source = OGetFullPath(from);
     OPath const target = OGetFullPath(to);
-    OFileFacts facts;
-    OError const error = OGetFacts(source, facts);
+    OError const error = OCheckFolder(source);
     if (error != OError::None) {
         return error;
-    }
-    if (!facts.isFolder) {
-        return OError::NotAFolder;
     }
     if (target.IsEmpty()) {
         return OError::InvalidName;

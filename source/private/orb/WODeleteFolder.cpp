@@ -135,13 +135,6 @@ class Deleter {
 } // namespace
 
 OError ODeleteFolder(OPath const &folder) {
-    OFileFacts facts;
-    OError const error = OGetFacts(folder, facts);
-    if (error != OError::None) {
-        return error;
-    }
-    if (!facts.isFolder) {
-        return OError::NotAFolder;
-    }
-    return Deleter(WOLongPath(folder).c_str()).Run();
+    OError const error = OCheckFolder(folder);
+    return error != OError::None ? error : Deleter(WOLongPath(folder).c_str()).Run();
 }

@@ -66,6 +66,12 @@ OError OGetFacts(OPath const &path, OFileFacts &facts) {
     return OError::None;
 }
 
+OError OCheckFolder(OPath const &path) {
+    OFileFacts facts;
+    OError const error = OGetFacts(path, facts);
+    return error == OError::None && !facts.isFolder ? OError::NotAFolder : error;
+}
+
 OError OMakeFile(OPath const &path, bool replace) {
     WOLongPath const name(path);
     if (!name.IsValid()) {

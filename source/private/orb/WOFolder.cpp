@@ -128,13 +128,6 @@ OError OMakeFolder(OPath const &path, bool parents) {
 }
 
 OError OListFolder(OPath const &folder, OListing const &wanted, std::vector<KTString> &names) {
-    OFileFacts facts;
-    OError const error = OGetFacts(folder, facts);
-    if (error != OError::None) {
-        return error;
-    }
-    if (!facts.isFolder) {
-        return OError::NotAFolder;
-    }
-    return Lister(WOLongPath(folder), wanted, names).Run();
+    OError const error = OCheckFolder(folder);
+    return error != OError::None ? error : Lister(WOLongPath(folder), wanted, names).Run();
 }

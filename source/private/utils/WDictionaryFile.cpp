@@ -2,7 +2,7 @@
 
 #include "DictionaryFile.h"
 
-#include "WOHandle.h"
+#include "WFileBytes.h"
 #include "WOLongPath.h"
 
 #include <windows.h>
@@ -16,7 +16,6 @@ namespace orvik_private {
 
 namespace {
 
-constexpr DWORD kMostAtOnce = DWORD{1} << 30; // one system call does not take all that memory can hold
 constexpr std::size_t kPending = std::size_t{1} << 16;
 constexpr std::uint64_t kWorthMapping = std::uint64_t{1} << 20;
 
@@ -50,39 +49,21 @@ class MappedFile final : public DictionaryBuffer {
     std::unique_ptr<void, UnmapView> m_View; // goes first
 };
 
-class FileSource final : public ByteSource {
+class MappableFile final : public WFileSource {
   public:
-    FileSource(WOHandle handle, std::uint64_t size) : m_Handle(std::move(handle)), m_Size(size) {}
-
-    std::uint64_t Size() const override { return m_Size; }
-    bool Failed() const override { return m_Failed; }
-
-    std::size_t Read(void *bytes, std::size_t count) override {
-        DWORD got = 0;
-        DWORD const wanted = static_cast<DWORD>(std::min<std::size_t>(count, kMostAtOnce));
-        if (ReadFile(m_Handle.Get(), bytes, wanted, &got, nullptr) == FALSE) {
-            m_Failed = true;
-            return 0;
-        }
-        return got;
-    }
+    using WFileSource::WFileSource;
 
     // Small files are read: that is as fast, and they are free again at once.
     std::shared_ptr<DictionaryBuffer> Map() override {
-        if (m_Size < kWorthMapping || !IsOnFixedDisk(m_Handle.Get())) {
+        if (Size() < kWorthMapping || !IsOnFixedDisk(Handle().Get())) {
             return nullptr;
         }
-        WOHandle const section(CreateFileMappingW(m_Handle.Get(), nullptr, PAGE_WRITECOPY, 0, 0, nullptr));
-        std::size_t const size = static_cast<std::size_t>(m_Size);
+        WOHandle const section(CreateFileMappingW(Handle().Get(), nullptr, PAGE_WRITECOPY, 0, 0, nullptr));
+        std::size_t const size = static_cast<std::size_t>(Size());
         std::unique_ptr<void, UnmapView> view(
             section.IsValid() ? MapViewOfFile(section.Get(), FILE_MAP_COPY, 0, 0, size) : nullptr);
-        return view == nullptr ? nullptr : std::make_shared<MappedFile>(m_Handle, std::move(view), size);
+        return view == nullptr ? nullptr : std::make_shared<MappedFile>(Handle(), std::move(view), size);
     }
-
-  private:
-    WOHandle m_Handle;
-    std::uint64_t m_Size;
-    bool m_Failed = false;
 };
 
 class FileSink final : public NewFile {
@@ -126,14 +107,8 @@ class FileSink final : public NewFile {
 
   private:
     void WriteOut(char const *bytes, std::size_t count) {
-        while (count != 0) {
-            DWORD done = 0;
-            DWORD const wanted = static_cast<DWORD>(std::min<std::size_t>(count, kMostAtOnce));
-            if (WriteFile(m_Handle.Get(), bytes, wanted, &done, nullptr) == FALSE || done == 0) {
-                throw std::runtime_error("the file cannot be written");
-            }
-            bytes += done;
-            count -= done;
+        if (!WriteWhole(m_Handle, bytes, count)) {
+            throw std::runtime_error("the file cannot be written");
         }
     }
 
@@ -160,13 +135,9 @@ std::unique_ptr<ByteSource> OpenDictionaryFile(OPath const &path) {
     if (!name.IsValid()) {
         return nullptr;
     }
-    WOHandle handle(CreateFileW(name.c_str(), GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_DELETE, nullptr, OPEN_EXISTING,
-                                FILE_FLAG_SEQUENTIAL_SCAN, nullptr));
-    LARGE_INTEGER size{};
-    if (!handle.IsValid() || GetFileSizeEx(handle.Get(), &size) == FALSE) {
-        return nullptr;
-    }
-    return std::make_unique<FileSource>(std::move(handle), static_cast<std::uint64_t>(size.QuadPart));
+    std::uint64_t size = 0;
+    WOHandle handle = OpenToRead(name.c_str(), size);
+    return handle.IsValid() ? std::make_unique<MappableFile>(std::move(handle), size) : nullptr;
 }
 
 std::unique_ptr<NewFile> CreateDictionaryFile(OPath const &path, bool &isTaken) {
