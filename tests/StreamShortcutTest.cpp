@@ -170,6 +170,9 @@ TEST_F(StreamReadAheadTest, HostileLengthsTakeWhatIsThere) {
 // A host's stream may change what a value's parts are.
 class Shifted : public CKTStreamRead {
   public:
+    Shifted() = default;
+    explicit Shifted(CKTStreamRead const &other) : CKTStreamRead(other) {}
+
     int XferInt32(int &value) override {
         ++calls;
         return CKTStreamRead::XferInt32(value);
@@ -206,8 +209,34 @@ TEST_F(StreamReadAheadTest, HostsThatDeriveSeeTheirPartsRead) {
     EXPECT_EQ(6, stream.calls);
 }
 
+// Expects both parts of the number to be seen, and gives the shared transport back.
+void ExpectPartsRead(Shifted &stream, long long expected) {
+    stream.calls = 0;
+    long long number = 0;
+    EXPECT_EQ(expected, stream.XferInt64(number));
+    EXPECT_EQ(2, stream.calls);
+    stream.SetXferBytes(nullptr);
+}
+
+TEST_F(StreamReadAheadTest, HostsThatDeriveFromACopySeeTheirPartsRead) {
+    CKTStreamRead plain;
+    Open(plain, std::string("\0\0\0\0\1\0\0\0\0\0\0\0\2\0\0\0\0\0\0\0\3\0\0\0\0", 25));
+    Shifted copied(plain);
+    ExpectPartsRead(copied, 1);
+    Shifted assigned;
+    static_cast<CKTStreamRead &>(assigned) = plain;
+    ExpectPartsRead(assigned, 2);
+    CKTStreamRead copy(plain);
+    long long number = 0;
+    EXPECT_EQ(3, copy.XferInt64(number));
+    copy.SetXferBytes(nullptr);
+}
+
 class Counting : public CKTStreamWrite {
   public:
+    Counting() = default;
+    explicit Counting(CKTStreamWrite const &other) : CKTStreamWrite(other) {}
+
     int XferInt32(int &value) override {
         ++calls;
         return CKTStreamWrite::XferInt32(value);
@@ -245,6 +274,24 @@ TEST_F(StreamShortcutTest, HostsThatDeriveSeeTheirPartsWritten) {
     EXPECT_EQ(5, stream.calls);
     stream.Flush();
     EXPECT_EQ(std::string("\1\0\0\0\2\0\0\0\4\0\0\0text\1\0\0\0\0\0\0\0\xF0\x3F", 26), Content("parts"));
+}
+
+TEST_F(StreamShortcutTest, HostsThatDeriveFromACopySeeTheirPartsWritten) {
+    CKTStreamWrite plain;
+    auto *const transport = new FileXferBytes;
+    plain.SetXferBytes(transport);
+    ASSERT_NE(0, transport->Open(File("copies"), FileXferBytes::kOpenWrite, 0, 0));
+    Counting copied(plain);
+    Counting assigned;
+    static_cast<CKTStreamWrite &>(assigned) = plain;
+    for (Counting *const stream : {&copied, &assigned}) {
+        long long number = 1;
+        stream->XferInt64(number);
+        EXPECT_EQ(2, stream->calls);
+        stream->SetXferBytes(nullptr);
+    }
+    plain.Flush();
+    EXPECT_EQ(std::string("\0\0\0\0\1\0\0\0\0\0\0\0\1\0\0\0", 16), Content("copies"));
 }
 
 } // namespace

@@ -20,30 +20,38 @@ constexpr int kBoolLine = 131;
 } // namespace
 
 CKTStreamRead::CKTStreamRead() = default;
-CKTStreamRead::CKTStreamRead(CKTStreamRead const &other) = default;
-CKTStreamRead &CKTStreamRead::operator=(CKTStreamRead const &other) = default;
+
+// The copy may become part of a class that derives: it is not taken for a plain stream.
+CKTStreamRead::CKTStreamRead(CKTStreamRead const &other)
+    : IKTStream(other), m_Transport(other.m_Transport), m_Swapping(other.m_Swapping) {}
+
+CKTStreamRead &CKTStreamRead::operator=(CKTStreamRead const &other) {
+    if (this != &other) {
+        SetXferBytes(other.m_Transport);
+        m_Swapping = other.m_Swapping;
+    }
+    return *this;
+}
 
 CKTStreamRead::~CKTStreamRead() {
     delete m_Transport;
     m_Transport = nullptr;
 }
 
+// Only the library's own stream on its own transport may go past the virtual tables: hosts that derive see every call.
 void CKTStreamRead::SetXferBytes(IKTXferBytes *transport) {
     m_Transport = transport;
-    m_IsFile = OFileShortcut::IsFor(transport) ? 1 : 0;
+    m_IsPlain = OFileShortcut::IsFor(transport) && typeid(*this) == typeid(CKTStreamRead) ? 1 : 0;
 }
 
 template <typename Value> inline void CKTStreamRead::ReadValue(Value &value) {
-    if (m_IsFile == 0 || !OFileShortcut::Take(static_cast<FileXferBytes &>(*m_Transport), value)) {
+    if (m_IsPlain == 0 || !OFileShortcut::Take(static_cast<FileXferBytes &>(*m_Transport), value)) {
         m_Transport->Read(&value, sizeof value);
     }
 }
 
-// Whether a value made of several may be taken whole: its parts go through the virtual table only for those who derive.
-inline bool CKTStreamRead::IsPlain() const { return m_IsFile != 0 && typeid(*this) == typeid(CKTStreamRead); }
-
 template <typename Value> inline bool CKTStreamRead::TakeWhole(Value &value) {
-    return IsPlain() && OFileShortcut::Take(static_cast<FileXferBytes &>(*m_Transport), value);
+    return m_IsPlain != 0 && OFileShortcut::Take(static_cast<FileXferBytes &>(*m_Transport), value);
 }
 
 // ---- bytes and text ----
@@ -51,7 +59,7 @@ template <typename Value> inline bool CKTStreamRead::TakeWhole(Value &value) {
 int CKTStreamRead::XferByte(unsigned char *buffer, int count) {
     unsigned int const size = OArrayBytes<unsigned char>(count);
     auto const copy = [=](unsigned char const *from) { OCopyBytes(buffer, from, size); };
-    if (m_IsFile != 0 && size != 0 && OFileShortcut::Take(static_cast<FileXferBytes &>(*m_Transport), size, copy)) {
+    if (m_IsPlain != 0 && size != 0 && OFileShortcut::Take(static_cast<FileXferBytes &>(*m_Transport), size, copy)) {
         return count;
     }
     return static_cast<int>(m_Transport->Read(buffer, size));
@@ -79,7 +87,7 @@ inline bool CKTStreamRead::TakeString(KTString &value, bool utf8, bool withCount
 }
 
 KTString CKTStreamRead::XferString(KTString &value, bool utf8, bool withCount) try {
-    if (IsPlain() && TakeString(value, utf8, withCount)) {
+    if (m_IsPlain != 0 && TakeString(value, utf8, withCount)) {
         return value;
     }
     int count = 0; // stays so where the stream has ended
@@ -112,7 +120,7 @@ int CKTStreamRead::XferBool(KTBool16 *values, int count) { return XferInt16(valu
 
 KTBool16 CKTStreamRead::XferBool(KTBool16 &value) {
     short number = value;
-    if (IsPlain()) {
+    if (m_IsPlain != 0) {
         CKTStreamRead::XferInt16(number);
     } else {
         XferInt16(number);

@@ -21,37 +21,45 @@ constexpr int kBoolLine = 129;
 } // namespace
 
 CKTStreamWrite::CKTStreamWrite() = default;
-CKTStreamWrite::CKTStreamWrite(CKTStreamWrite const &other) = default;
-CKTStreamWrite &CKTStreamWrite::operator=(CKTStreamWrite const &other) = default;
+
+// The copy may become part of a class that derives: it is not taken for a plain stream.
+CKTStreamWrite::CKTStreamWrite(CKTStreamWrite const &other)
+    : IKTStream(other), m_Transport(other.m_Transport), m_Swapping(other.m_Swapping) {}
+
+CKTStreamWrite &CKTStreamWrite::operator=(CKTStreamWrite const &other) {
+    if (this != &other) {
+        SetXferBytes(other.m_Transport);
+        m_Swapping = other.m_Swapping;
+    }
+    return *this;
+}
 
 CKTStreamWrite::~CKTStreamWrite() {
     delete m_Transport;
     m_Transport = nullptr;
 }
 
+// Only the library's own stream on its own transport may go past the virtual tables: hosts that derive see every call.
 void CKTStreamWrite::SetXferBytes(IKTXferBytes *transport) {
     m_Transport = transport;
-    m_IsFile = OFileShortcut::IsFor(transport) ? 1 : 0;
+    m_IsPlain = OFileShortcut::IsFor(transport) && typeid(*this) == typeid(CKTStreamWrite) ? 1 : 0;
 }
 IKTXferBytes *CKTStreamWrite::GetXferBytes() { return m_Transport; }
 
 template <typename Value> inline void CKTStreamWrite::WriteValue(Value const &value) {
-    if (m_IsFile == 0 || !OFileShortcut::Put(static_cast<FileXferBytes &>(*m_Transport), value)) {
+    if (m_IsPlain == 0 || !OFileShortcut::Put(static_cast<FileXferBytes &>(*m_Transport), value)) {
         Value copy = value; // transports take variable bytes, and only read them
         m_Transport->Write(&copy, sizeof copy);
     }
 }
 
-// Whether a value made of several may be put whole: its parts go through the virtual table only for those who derive.
-inline bool CKTStreamWrite::IsPlain() const { return m_IsFile != 0 && typeid(*this) == typeid(CKTStreamWrite); }
-
 template <typename Value> inline bool CKTStreamWrite::PutWhole(Value const &value) {
-    return IsPlain() && OFileShortcut::Put(static_cast<FileXferBytes &>(*m_Transport), value);
+    return m_IsPlain != 0 && OFileShortcut::Put(static_cast<FileXferBytes &>(*m_Transport), value);
 }
 
 inline unsigned int CKTStreamWrite::WriteBytes(void *bytes, unsigned int count) {
     auto const copy = [=](unsigned char *to) { OCopyBytes(to, static_cast<unsigned char const *>(bytes), count); };
-    if (m_IsFile != 0 && OFileShortcut::Put(static_cast<FileXferBytes &>(*m_Transport), count, copy)) {
+    if (m_IsPlain != 0 && OFileShortcut::Put(static_cast<FileXferBytes &>(*m_Transport), count, copy)) {
         return count;
     }
     return m_Transport->Write(bytes, count);
@@ -87,7 +95,7 @@ inline bool CKTStreamWrite::PutString(KTString const &value, bool utf8, bool wit
 }
 
 KTString CKTStreamWrite::XferString(KTString &value, bool utf8, bool withCount) try {
-    if (IsPlain() && PutString(value, utf8, withCount)) {
+    if (m_IsPlain != 0 && PutString(value, utf8, withCount)) {
         return value;
     }
     OStreamTextWriter const text(value, utf8);
@@ -124,7 +132,7 @@ KTBool16 CKTStreamWrite::XferBool(KTBool16 &value) {
         OStreamReport("CStreamWrite::XferBool - this isn't a bool you are writing", kReportPath, kBoolLine);
     }
     value = value != 0 ? 1 : 0;
-    if (IsPlain()) {
+    if (m_IsPlain != 0) {
         return CKTStreamWrite::XferInt16(value);
     }
     XferInt16(value);

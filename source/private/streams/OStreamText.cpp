@@ -12,13 +12,11 @@ namespace {
 
 constexpr int kFirstPiece = 0x40000; // memory that a length in front of a text may ask for before any byte has come
 
-// ASCII is copied in blocks, the last of which overlaps the one before; so no character is copied alone but in texts of
-// less than four.
+// ASCII is copied in blocks; of a longer text the last one overlaps the one before.
 
 using OUtf::HighBits;
 using OUtf::Load;
 using OUtf::LoadAs;
-using OUtf::Store;
 using OUtf::StoreAs;
 
 // One character to a unit each.
@@ -30,20 +28,25 @@ struct Widen16 {
         return HighBits(_mm_cmpgt_epi8(bytes, _mm_setzero_si128())) == 0xFFFF;
     }
 };
-template <typename Few> struct Widen {
-    static constexpr std::size_t kSize = sizeof(Few);
-    bool operator()(char const *from, unsigned short *to) const {
-        __m128i const bytes = _mm_cvtsi64_si128(static_cast<long long>(LoadAs<Few>(from)));
-        __m128i const units = _mm_unpacklo_epi8(bytes, _mm_setzero_si128());
-        if constexpr (kSize == 8) {
-            Store(to, units);
-        } else {
-            StoreAs(to, _mm_cvtsi128_si64(units));
+
+// Less than 16 characters, with zeros behind them.
+__m128i LoadFew(char const *from, std::size_t count) {
+    std::uint64_t low = 0;
+    std::uint64_t high = 0;
+    if (count >= 8) {
+        low = LoadAs<std::uint64_t>(from);
+        high = LoadAs<std::uint64_t>(from + count - 8) >> 8 >> (8 * (15 - count)); // without those of `low`
+    } else if (count >= 4) {
+        auto const last = LoadAs<std::uint32_t>(from + count - 4);
+        low = LoadAs<std::uint32_t>(from) | (std::uint64_t{last} << (8 * (count - 4))); // where both have one, the same
+    } else {
+        for (std::size_t i = 0; i < count; ++i) {
+            low |= std::uint64_t{static_cast<unsigned char>(from[i])} << (8 * i);
         }
-        constexpr unsigned int kAll = (1U << kSize) - 1;
-        return HighBits(_mm_cmpgt_epi8(bytes, _mm_setzero_si128())) == kAll;
     }
-};
+    return _mm_unpacklo_epi64(_mm_cvtsi64_si128(static_cast<long long>(low)),
+                              _mm_cvtsi64_si128(static_cast<long long>(high)));
+}
 
 // One unit to a character each.
 struct Narrow8 {
@@ -76,23 +79,15 @@ bool CopyBlocks(From const *from, std::size_t count, To *to, Block block) {
     return block(from + last, to + last) && isPlain;
 }
 
-// Whether all are ASCII and none of them is zero; each has its unit then.
+// Whether all are ASCII and none of them is zero; each has its unit then. A few are written as one block of 16, as whoever
+// reads them next would have to wait for blocks that overlap. REQUIRES: room for 16 units at least.
 bool WidenPlain(char const *from, std::size_t count, unsigned short *to) {
     if (count >= Widen16::kSize) {
         return CopyBlocks(from, count, to, Widen16());
     }
-    if (count >= 8) {
-        return CopyBlocks(from, count, to, Widen<std::uint64_t>());
-    }
-    if (count >= 4) {
-        return CopyBlocks(from, count, to, Widen<std::uint32_t>());
-    }
-    bool isPlain = true;
-    for (std::size_t i = 0; i < count; ++i) {
-        to[i] = static_cast<unsigned char>(from[i]);
-        isPlain &= from[i] > 0;
-    }
-    return isPlain;
+    __m128i const bytes = LoadFew(from, count);
+    OUtf::WidenBlock(bytes, to);
+    return HighBits(_mm_cmpgt_epi8(bytes, _mm_setzero_si128())) == (1U << count) - 1;
 }
 
 // Whether all are ASCII, zeros among them; each has its byte then.

@@ -60,7 +60,6 @@ class KT_PUBLIC_API CKTStreamRead : public IKTStream {
     void Close() override;
 
   private:
-    bool IsPlain() const;
     template <typename Value> void ReadValue(Value &value);
     template <typename Value> bool TakeWhole(Value &value);
     bool TakeString(KTString &value, bool utf8, bool withCount);
@@ -70,7 +69,7 @@ class KT_PUBLIC_API CKTStreamRead : public IKTStream {
     // The order of the fields is part of the binary interface.
     IKTXferBytes *m_Transport = nullptr;
     KTBool16 m_Swapping = 0;
-    KTBool16 m_IsFile = 0; // whether the transport is the library's own on a file; in what was left of 8 bytes
+    KTBool16 m_IsPlain = 0; // whether neither stream nor transport is a host's own; in what was left of 8 bytes
 };
 
 #include "KTEndExports.h"

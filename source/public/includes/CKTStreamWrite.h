@@ -63,7 +63,6 @@ class KT_PUBLIC_API CKTStreamWrite : public IKTStream {
     void Close() override;
 
   private:
-    bool IsPlain() const;
     template <typename Value> void WriteValue(Value const &value);
     template <typename Value> bool PutWhole(Value const &value);
     bool PutString(KTString const &value, bool utf8, bool withCount);
@@ -73,7 +72,7 @@ class KT_PUBLIC_API CKTStreamWrite : public IKTStream {
     // The order of the fields is part of the binary interface.
     IKTXferBytes *m_Transport = nullptr;
     KTBool16 m_Swapping = 0;
-    KTBool16 m_IsFile = 0; // whether the transport is the library's own on a file; in what was left of 8 bytes
+    KTBool16 m_IsPlain = 0; // whether neither stream nor transport is a host's own; in what was left of 8 bytes
 };
 
 #include "KTEndExports.h"

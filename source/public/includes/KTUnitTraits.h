@@ -58,7 +58,8 @@ struct KTUnitTraits {
     }
 
     static char_type *copy(char_type *to, char_type const *from, std::size_t count) noexcept {
-        return count == 0 ? to : static_cast<char_type *>(std::memcpy(to, from, count * sizeof(char_type)));
+        Copy(to, from, count);
+        return to;
     }
 
     static constexpr char_type *assign(char_type *to, std::size_t count, char_type unit) noexcept {
@@ -73,6 +74,32 @@ struct KTUnitTraits {
     static constexpr bool eq_int_type(int_type a, int_type b) noexcept { return a == b; }
     static constexpr int_type eof() noexcept { return 0xFFFFFFFFU; }
     static constexpr int_type not_eof(int_type value) noexcept { return value == eof() ? 0U : value; }
+
+  private:
+    // Most texts are short: a call of the general function would cost more than the copy. The blocks do not overlap, as
+    // the next copy would have to wait before it can read what two blocks wrote. Not inlined, as compilers that see a
+    // text's few units beside the branches for more warn without reason.
+    [[gnu::noinline]] static void Copy(char_type *to, char_type const *from, std::size_t count) noexcept {
+        if (count >= 32) {
+            std::memcpy(to, from, count * sizeof(char_type));
+            return;
+        }
+        CopyBlock<16>(to, from, count);
+        CopyBlock<8>(to, from, count);
+        CopyBlock<4>(to, from, count);
+        CopyBlock<2>(to, from, count);
+        CopyBlock<1>(to, from, count);
+    }
+
+    // Copies a block if `count` has one of its size, and steps over it.
+    template <std::size_t Size>
+    static void CopyBlock(char_type *&to, char_type const *&from, std::size_t count) noexcept {
+        if ((count & Size) != 0) {
+            std::memcpy(to, from, Size * sizeof(char_type));
+            to += Size;
+            from += Size;
+        }
+    }
 };
 
 #include "KTBeginExports.h"
