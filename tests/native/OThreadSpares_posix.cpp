@@ -1,7 +1,7 @@
 // OThreadSpares_posix.cpp: a thread's spare blocks in the compiler's thread-local storage for the native developer
 // build.
 
-#include "OThreadSpares.h"
+#include "OThreadSpareLists.h"
 
 namespace {
 
@@ -14,6 +14,10 @@ struct Slot {
 
 thread_local Slot t_Slot;
 
+OThreadSpares *FindThreadSpares() noexcept { return t_Slot.ended ? nullptr : &t_Slot.spares; }
+
 } // namespace
 
-OThreadSpares *OGetThreadSpares() noexcept { return t_Slot.ended ? nullptr : &t_Slot.spares; }
+void *OTakeBlock(std::size_t size) { return OTakeBlockFrom(FindThreadSpares, size); }
+
+void OGiveBlock(void *block, std::size_t size) noexcept { OGiveBlockTo(FindThreadSpares, block, size); }

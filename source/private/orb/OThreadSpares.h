@@ -19,15 +19,6 @@
 
 #include <cstddef>
 
-/// What the blocks' sizes are multiples of, in bytes.
-constexpr std::size_t kOSpareBlockStep = 16;
-
-/// Largest block in bytes that a thread keeps.
-constexpr std::size_t kOLargestSpareBlock = 256;
-
-/// Most blocks that a thread keeps of each size.
-constexpr unsigned kOMostSpareBlocks = 8;
-
 /// A block of at least `size` bytes, aligned for any standard type: a spare one of this thread, or a new one from the
 /// global heap. Throws std::bad_alloc.
 void *OTakeBlock(std::size_t size);
@@ -35,43 +26,3 @@ void *OTakeBlock(std::size_t size);
 /// Gives the block back, which OTakeBlock handed out for the same size, on this thread or another one. This thread
 /// keeps it, or frees it when it has enough. REQUIRES: block is not null.
 void OGiveBlock(void *block, std::size_t size) noexcept;
-
-// ---- for the platform file behind this header ----
-
-/// One thread's spare blocks.
-class OThreadSpares {
-  public:
-    /// Keeps none.
-    OThreadSpares() noexcept = default;
-
-    OThreadSpares(OThreadSpares const &) = delete;
-    OThreadSpares &operator=(OThreadSpares const &) = delete;
-
-    /// Frees all blocks.
-    ~OThreadSpares();
-
-    /// A kept block of the list, or null if there is none.
-    void *Take(std::size_t list) noexcept;
-
-    /// Keeps the block in the list. Returns false, and leaves it to the caller, when the list is full.
-    bool Keep(std::size_t list, void *block) noexcept;
-
-    /// Frees all blocks, and keeps none from now on: for a thread that ends.
-    void Close() noexcept;
-
-  private:
-    struct Block {
-        Block *next;
-    };
-
-    struct List {
-        Block *first = nullptr;
-        unsigned count = 0;
-    };
-
-    List m_Lists[kOLargestSpareBlock / kOSpareBlockStep];
-};
-
-/// This thread's spare blocks, made at the first call; null where there is no memory or no slot left for them. Once the
-/// thread's end has begun: null, or spares that are closed.
-OThreadSpares *OGetThreadSpares() noexcept;

@@ -5,7 +5,7 @@
 // TlsGetValue would clear the last error, which must survive the copying of a text. The library's entry point frees a
 // thread's blocks when the thread ends.
 
-#include "OThreadSpares.h"
+#include "OThreadSpareLists.h"
 
 #include <windows.h>
 
@@ -65,7 +65,7 @@ bool WriteSlot(void *value) noexcept {
     return g_Slot != TLS_OUT_OF_INDEXES && TlsSetValue(g_Slot, value) != 0;
 }
 
-OThreadSpares *MakeThreadSpares() noexcept {
+[[gnu::noinline]] OThreadSpares *MakeThreadSpares() noexcept {
     auto *const spares = g_Slot == TLS_OUT_OF_INDEXES ? nullptr : ::new (std::nothrow) OThreadSpares;
     if (spares == nullptr || WriteSlot(spares)) {
         return spares;
@@ -82,12 +82,18 @@ void EndThreadSpares() noexcept {
     }
 }
 
-} // namespace
-
-OThreadSpares *OGetThreadSpares() noexcept {
+// This thread's spare blocks, made at the first call; null where there is no memory or no slot left for them. Once the
+// thread's end has begun: null, or spares that are closed.
+OThreadSpares *FindThreadSpares() noexcept {
     auto *const spares = static_cast<OThreadSpares *>(ReadSlot());
     return spares == nullptr ? MakeThreadSpares() : spares;
 }
+
+} // namespace
+
+void *OTakeBlock(std::size_t size) { return OTakeBlockFrom(FindThreadSpares, size); }
+
+void OGiveBlock(void *block, std::size_t size) noexcept { OGiveBlockTo(FindThreadSpares, block, size); }
 
 // The system calls this for every thread that ends and for the library's own unload (`process` is null then, and the
 // slot goes back; at process end everything does).
