@@ -17,6 +17,15 @@ constexpr char kReportPath[] = "source/private/streams/CKTStreamRead";
 constexpr int kMemoryLine = 92;
 constexpr int kBoolLine = 131;
 
+// Reads a number through the transport; what does not come of it stays as it was. Not inlined, as nearly all numbers are
+// read ahead, and those calls need no frame then.
+template <typename Value> [[gnu::noinline]] Value ReadNumber(IKTXferBytes *transport, bool isReversed, Value &value) {
+    Value bytes = isReversed ? OReversed(value) : value;
+    transport->Read(&bytes, sizeof bytes);
+    value = isReversed ? OReversed(bytes) : bytes;
+    return value;
+}
+
 } // namespace
 
 CKTStreamRead::CKTStreamRead() = default;
@@ -44,14 +53,19 @@ void CKTStreamRead::SetXferBytes(IKTXferBytes *transport) {
     m_IsPlain = OFileShortcut::IsFor(transport) && typeid(*this) == typeid(CKTStreamRead) ? 1 : 0;
 }
 
-template <typename Value> inline void CKTStreamRead::ReadValue(Value &value) {
-    if (m_IsPlain == 0 || !OFileShortcut::Take(static_cast<FileXferBytes &>(*m_Transport), value)) {
-        m_Transport->Read(&value, sizeof value);
-    }
-}
-
+// Takes the value's bytes out of those read ahead, as they are; false, and nothing done, if that way is not open.
 template <typename Value> inline bool CKTStreamRead::TakeWhole(Value &value) {
     return m_IsPlain != 0 && OFileShortcut::Take(static_cast<FileXferBytes &>(*m_Transport), value);
+}
+
+// The same for a number in the stream's byte order.
+template <typename Value> inline bool CKTStreamRead::TakeNumber(Value &value) {
+    Value bytes = 0;
+    if (!TakeWhole(bytes)) {
+        return false;
+    }
+    value = m_Swapping == 0 ? bytes : OReversed(bytes);
+    return true;
 }
 
 // ---- bytes and text ----
@@ -66,7 +80,9 @@ int CKTStreamRead::XferByte(unsigned char *buffer, int count) {
 }
 
 unsigned char CKTStreamRead::XferByte(unsigned char &value) {
-    ReadValue(value);
+    if (!TakeWhole(value)) {
+        m_Transport->Read(&value, sizeof value);
+    }
     return value;
 }
 
@@ -120,9 +136,7 @@ int CKTStreamRead::XferBool(KTBool16 *values, int count) { return XferInt16(valu
 
 KTBool16 CKTStreamRead::XferBool(KTBool16 &value) {
     short number = value;
-    if (m_IsPlain != 0) {
-        CKTStreamRead::XferInt16(number);
-    } else {
+    if (!TakeNumber(number)) {
         XferInt16(number);
     }
     if (number != 0 && number != 1) {
@@ -142,14 +156,7 @@ int CKTStreamRead::XferInt16(short *values, int count) {
 }
 
 short CKTStreamRead::XferInt16(short &value) {
-    if (m_Swapping == 0) {
-        ReadValue(value);
-        return value;
-    }
-    short reversed = OReversed(value);
-    ReadValue(reversed);
-    value = OReversed(reversed);
-    return value;
+    return TakeNumber(value) ? value : ReadNumber(m_Transport, m_Swapping != 0, value);
 }
 
 int CKTStreamRead::XferInt32(int *values, int count) {
@@ -161,14 +168,7 @@ int CKTStreamRead::XferInt32(int *values, int count) {
 }
 
 int CKTStreamRead::XferInt32(int &value) {
-    if (m_Swapping == 0) {
-        ReadValue(value);
-        return value;
-    }
-    int reversed = OReversed(value);
-    ReadValue(reversed);
-    value = OReversed(reversed);
-    return value;
+    return TakeNumber(value) ? value : ReadNumber(m_Transport, m_Swapping != 0, value);
 }
 
 long long CKTStreamRead::XferInt64(long long &value) {

@@ -60,8 +60,8 @@ class KT_PUBLIC_API CKTStreamRead : public IKTStream {
     void Close() override;
 
   private:
-    template <typename Value> void ReadValue(Value &value);
     template <typename Value> bool TakeWhole(Value &value);
+    template <typename Value> bool TakeNumber(Value &value);
     bool TakeString(KTString &value, bool utf8, bool withCount);
     int XferByteReverse(unsigned char *buffer, int count);
     bool ReadReal(KTReal &value);
