@@ -87,6 +87,7 @@
 //     KTPrimitiveRenderModel: std::vector<KTRenderObject3D>; KTCompositeRenderModel: std::vector<KTLargeRenderObject3D>
 
 #include "KTPublic.h"
+#include "TestTimerWindow.h"
 #include "VTable.h"
 
 #include <gtest/gtest.h>
@@ -264,7 +265,7 @@ TEST(AbiLayoutTest, TheTimerServiceHasItsFieldsInOrder) {
         message += 0x04040404;
     }
     EXPECT_EQ(0, ValueAt<KTInt64>(service, 5832)); // behind the map: no UI timer's function runs
-    EXPECT_EQ(FindWindowW(L"InvisibleTimerServiceClass", nullptr), PointerAt(service, 5840));
+    EXPECT_EQ(FindTimerWindow(), PointerAt(service, 5840));
     KTDestroyTimerService();
 }
 

@@ -12,9 +12,25 @@
 
 #include "WImportHook.h"
 
-#include <optional>
+#include <string_view>
 
-inline HWND FindTimerWindow() { return FindWindowW(L"InvisibleTimerServiceClass", L"InvisibleTimerService"); }
+/// This process's window, or null. Other test programs may have theirs at the same time.
+inline HWND FindTimerWindow() {
+    HWND found = nullptr;
+    auto const look = [](HWND window, LPARAM result) -> BOOL {
+        wchar_t name[64]{};
+        DWORD process = 0;
+        GetWindowThreadProcessId(window, &process);
+        bool const isOurs = process == GetCurrentProcessId() && GetClassNameW(window, name, 64) != 0 &&
+                            std::wstring_view(name) == L"InvisibleTimerServiceClass";
+        if (isOurs) {
+            *reinterpret_cast<HWND *>(result) = window;
+        }
+        return isOurs ? FALSE : TRUE;
+    };
+    EnumWindows(look, reinterpret_cast<LPARAM>(&found));
+    return found;
+}
 
 inline void TickTimerWindow(KTInt64 id) { SendMessageW(FindTimerWindow(), WM_TIMER, static_cast<WPARAM>(id), 0); }
 
